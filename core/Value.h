@@ -1,0 +1,140 @@
+// The one value type of the system: what the baseband's event objects, the decoded metric
+// dictionaries and the screens' cells are made of.
+//
+// A Value is null, a bool, a signed or unsigned 64-bit integer, a 32-bit float, a string,
+// bytes, an array, or a dictionary with string keys that keeps insertion order (a decoded
+// message's field order is its enumeration order everywhere).
+#pragma once
+
+#include <cstdint>
+#include <initializer_list>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <variant>
+#include <vector>
+
+namespace pyx {
+
+class Value;
+using Bytes = std::vector<std::uint8_t>;
+using Array = std::vector<Value>;
+
+struct DictEntry;
+
+// A dictionary with string keys, in insertion order. Lookups are linear: the system's
+// dictionaries hold a few dozen entries at most, where a scan beats hashing.
+class Dict {
+public:
+    using Entries = std::vector<DictEntry>;
+    using const_iterator = Entries::const_iterator;
+    using iterator = Entries::iterator;
+
+    Dict() = default;
+    Dict(std::initializer_list<DictEntry> entries);
+
+    [[nodiscard]] std::size_t size() const { return entries_.size(); }
+    [[nodiscard]] bool empty() const { return entries_.empty(); }
+    [[nodiscard]] const_iterator begin() const { return entries_.begin(); }
+    [[nodiscard]] const_iterator end() const { return entries_.end(); }
+    [[nodiscard]] iterator begin() { return entries_.begin(); }
+    [[nodiscard]] iterator end() { return entries_.end(); }
+    [[nodiscard]] const DictEntry& at(std::size_t index) const { return entries_.at(index); }
+
+    // The value under key, or nullptr when the key is absent.
+    [[nodiscard]] const Value* find(std::string_view key) const;
+    [[nodiscard]] Value* find(std::string_view key);
+    [[nodiscard]] bool contains(std::string_view key) const { return find(key) != nullptr; }
+
+    // Replaces the value of an existing key in place (its position is kept), or appends.
+    Value& set(std::string key, Value value);
+    // Appends without looking for an existing key; for builders that know keys are unique.
+    Value& append(std::string key, Value value);
+    // Removes the key if present; returns whether it was.
+    bool erase(std::string_view key);
+    void reserve(std::size_t n) { entries_.reserve(n); }
+
+    friend bool operator==(const Dict& a, const Dict& b);
+
+private:
+    Entries entries_;
+};
+
+class Value {
+public:
+    enum class Kind { Null, Bool, Int, UInt, Float, String, Data, List, Map };
+
+    Value() = default;
+    Value(std::nullptr_t) {}
+    Value(bool v) : v_(v) {}
+    Value(std::int32_t v) : v_(static_cast<std::int64_t>(v)) {}
+    Value(std::int64_t v) : v_(v) {}
+    Value(std::uint32_t v) : v_(static_cast<std::uint64_t>(v)) {}
+    Value(std::uint64_t v) : v_(v) {}
+    Value(float v) : v_(v) {}
+    Value(std::string v) : v_(std::move(v)) {}
+    Value(std::string_view v) : v_(std::string(v)) {}
+    Value(const char* v) : v_(std::string(v)) {}
+    Value(pyx::Bytes v) : v_(std::move(v)) {}
+    Value(pyx::Array v) : v_(std::move(v)) {}
+    Value(pyx::Dict v) : v_(std::move(v)) {}
+
+    [[nodiscard]] Kind kind() const { return static_cast<Kind>(v_.index()); }
+    [[nodiscard]] bool isNull() const { return kind() == Kind::Null; }
+    [[nodiscard]] bool isBool() const { return kind() == Kind::Bool; }
+    [[nodiscard]] bool isInt() const { return kind() == Kind::Int; }
+    [[nodiscard]] bool isUInt() const { return kind() == Kind::UInt; }
+    [[nodiscard]] bool isInteger() const { return isInt() || isUInt(); }
+    [[nodiscard]] bool isFloat() const { return kind() == Kind::Float; }
+    [[nodiscard]] bool isNumber() const { return isBool() || isInteger() || isFloat(); }
+    [[nodiscard]] bool isString() const { return kind() == Kind::String; }
+    [[nodiscard]] bool isBytes() const { return kind() == Kind::Data; }
+    [[nodiscard]] bool isArray() const { return kind() == Kind::List; }
+    [[nodiscard]] bool isDict() const { return kind() == Kind::Map; }
+
+    // Typed access; each throws std::bad_variant_access on a value of another kind.
+    [[nodiscard]] bool asBool() const { return std::get<bool>(v_); }
+    [[nodiscard]] std::int64_t asInt() const { return std::get<std::int64_t>(v_); }
+    [[nodiscard]] std::uint64_t asUInt() const { return std::get<std::uint64_t>(v_); }
+    [[nodiscard]] float asFloat() const { return std::get<float>(v_); }
+    [[nodiscard]] const std::string& asString() const { return std::get<std::string>(v_); }
+    [[nodiscard]] const pyx::Bytes& asBytes() const { return std::get<pyx::Bytes>(v_); }
+    [[nodiscard]] const pyx::Array& asArray() const { return std::get<pyx::Array>(v_); }
+    [[nodiscard]] pyx::Array& asArray() { return std::get<pyx::Array>(v_); }
+    [[nodiscard]] const pyx::Dict& asDict() const { return std::get<pyx::Dict>(v_); }
+    [[nodiscard]] pyx::Dict& asDict() { return std::get<pyx::Dict>(v_); }
+
+    // Numeric views, as a number object of the platform answers them: a bool, an integer of
+    // either sign or a float converts; anything else gives nothing. toInt64 gives nothing for
+    // an unsigned value above INT64_MAX and for a float that is not finite or out of range.
+    [[nodiscard]] std::optional<std::int64_t> toInt64() const;
+    [[nodiscard]] std::optional<float> toFloat() const;
+
+    // The textual description used for the detail text of screen cells and for log lines.
+    [[nodiscard]] std::string description() const;
+    void appendDescription(std::string& out) const;
+
+    friend bool operator==(const Value& a, const Value& b) { return a.v_ == b.v_; }
+
+private:
+    std::variant<std::monostate, bool, std::int64_t, std::uint64_t, float, std::string,
+                 pyx::Bytes, pyx::Array, pyx::Dict>
+        v_;
+};
+
+struct DictEntry {
+    std::string key;
+    Value value;
+    friend bool operator==(const DictEntry& a, const DictEntry& b) = default;
+};
+
+// The shortest text that reads back as the same float, always with a decimal point
+// ("20.0", "-2.5", "1.4"); exponent forms, infinities and NaN as std::to_chars gives them.
+std::string formatFloat(float value);
+// Lowercase hex in angle brackets with a blank after every four bytes: "<0a0b0c0d 0e0f>".
+std::string describeBytes(const Bytes& bytes);
+// Plain lowercase hex digits, no separators: "0a0b".
+std::string hexString(const Bytes& bytes);
+
+}  // namespace pyx

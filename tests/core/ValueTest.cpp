@@ -1,0 +1,103 @@
+#include "core/Value.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+using pyx::Array;
+using pyx::Bytes;
+using pyx::Dict;
+using pyx::Value;
+
+TEST(ValueDescription, IntegersAreDecimal) {
+    EXPECT_EQ(Value(std::int64_t{-42}).description(), "-42");
+    EXPECT_EQ(Value(std::uint64_t{18446744073709551615ULL}).description(), "18446744073709551615");
+    EXPECT_EQ(Value(std::uint32_t{0}).description(), "0");
+}
+
+TEST(ValueDescription, BooleansAreOneOrZero) {
+    EXPECT_EQ(Value(true).description(), "1");
+    EXPECT_EQ(Value(false).description(), "0");
+}
+
+TEST(ValueDescription, FloatsAreShortestWithDecimalPoint) {
+    EXPECT_EQ(Value(20.0F).description(), "20.0");
+    EXPECT_EQ(Value(-2.5F).description(), "-2.5");
+    EXPECT_EQ(Value(1.4F).description(), "1.4");
+    EXPECT_EQ(Value(0.0F).description(), "0.0");
+    EXPECT_EQ(Value(-10.5F).description(), "-10.5");
+    EXPECT_EQ(Value(15.5F).description(), "15.5");
+    EXPECT_EQ(Value(0.1F).description(), "0.1");
+}
+
+TEST(ValueDescription, StringsAsTheyAre) {
+    EXPECT_EQ(Value("KLTE_RRC_STATE_IDLE").description(), "KLTE_RRC_STATE_IDLE");
+    EXPECT_EQ(Value("").description(), "");
+}
+
+TEST(ValueDescription, BytesAsGroupedLowercaseHex) {
+    EXPECT_EQ(Value(Bytes{0x0a, 0x0b, 0x0c, 0x0d, 0x0e, 0x0f}).description(), "<0a0b0c0d 0e0f>");
+    EXPECT_EQ(Value(Bytes{0xAB, 0xCD, 0xEF, 0x01}).description(), "<abcdef01>");
+    EXPECT_EQ(Value(Bytes{}).description(), "<>");
+}
+
+TEST(ValueDescription, ArraysAndDictionariesNestOnOneLine) {
+    Value v(Dict{{"a", Value(std::int64_t{1})},
+                 {"list", Value(Array{Value(1.5F), Value("x")})},
+                 {"inner", Value(Dict{{"b", Value(true)}})}});
+    EXPECT_EQ(v.description(), "{a: 1, list: [1.5, x], inner: {b: 1}}");
+    EXPECT_EQ(Value(Array{}).description(), "[]");
+    EXPECT_EQ(Value(Dict{}).description(), "{}");
+    EXPECT_EQ(Value().description(), "(null)");
+}
+
+TEST(ValueDict, KeepsInsertionOrder) {
+    Dict d;
+    d.set("zeta", Value(std::int64_t{1}));
+    d.set("alpha", Value(std::int64_t{2}));
+    d.set("mid", Value(std::int64_t{3}));
+    std::vector<std::string> keys;
+    for (const auto& e : d) keys.push_back(e.key);
+    EXPECT_EQ(keys, (std::vector<std::string>{"zeta", "alpha", "mid"}));
+}
+
+TEST(ValueDict, SetReplacesInPlaceAndEraseRemoves) {
+    Dict d{{"a", Value(1)}, {"b", Value(2)}, {"c", Value(3)}};
+    d.set("b", Value("two"));
+    EXPECT_EQ(d.at(1).key, "b");
+    EXPECT_EQ(d.at(1).value, Value("two"));
+    EXPECT_TRUE(d.erase("a"));
+    EXPECT_FALSE(d.erase("a"));
+    EXPECT_EQ(d.size(), 2U);
+    EXPECT_EQ(d.at(0).key, "b");
+    EXPECT_EQ(d.find("zzz"), nullptr);
+}
+
+TEST(ValueDict, EqualityIsOrderSensitive) {
+    Dict a{{"x", Value(1)}, {"y", Value(2)}};
+    Dict b{{"y", Value(2)}, {"x", Value(1)}};
+    EXPECT_FALSE(a == b);
+    EXPECT_TRUE(a == (Dict{{"x", Value(1)}, {"y", Value(2)}}));
+}
+
+TEST(ValueKinds, EachConstructorGivesItsKind) {
+    EXPECT_TRUE(Value().isNull());
+    EXPECT_TRUE(Value(true).isBool());
+    EXPECT_TRUE(Value(std::int32_t{-1}).isInt());
+    EXPECT_TRUE(Value(std::uint32_t{1}).isUInt());
+    EXPECT_TRUE(Value(1.0F).isFloat());
+    EXPECT_TRUE(Value("s").isString());
+    EXPECT_TRUE(Value(Bytes{}).isBytes());
+    EXPECT_TRUE(Value(Array{}).isArray());
+    EXPECT_TRUE(Value(Dict{}).isDict());
+}
+
+TEST(ValueNumbers, ConversionsFollowNumberObjects) {
+    EXPECT_EQ(Value(std::uint64_t{97}).toInt64(), 97);
+    EXPECT_EQ(Value(true).toInt64(), 1);
+    EXPECT_EQ(Value(-2.75F).toInt64(), -2);
+    EXPECT_EQ(Value(std::numeric_limits<std::uint64_t>::max()).toInt64(), std::nullopt);
+    EXPECT_EQ(Value("12").toInt64(), std::nullopt);
+    EXPECT_EQ(Value(std::int64_t{34}).toFloat(), 34.0F);
+    EXPECT_EQ(Value(Bytes{1}).toFloat(), std::nullopt);
+}
