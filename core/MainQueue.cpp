@@ -27,7 +27,7 @@ void MainQueue::run() {
         Task task = std::move(tasks_.front());
         tasks_.pop_front();
         lock.unlock();
-        task();
+        runTask(task);
         task = nullptr;
         lock.lock();
     }
@@ -49,8 +49,30 @@ std::size_t MainQueue::drain() {
         owner_ = std::this_thread::get_id();
         batch.swap(tasks_);
     }
-    for (auto& task : batch) task();
+    for (auto& task : batch) runTask(task);
     return batch.size();
+}
+
+void MainQueue::runTask(Task& task) {
+    std::function<void(std::exception_ptr)> handler;
+    {
+        const std::lock_guard lock(mutex_);
+        handler = errorHandler_;
+    }
+    if (!handler) {
+        task();
+        return;
+    }
+    try {
+        task();
+    } catch (...) {
+        handler(std::current_exception());
+    }
+}
+
+void MainQueue::setErrorHandler(std::function<void(std::exception_ptr)> handler) {
+    const std::lock_guard lock(mutex_);
+    errorHandler_ = std::move(handler);
 }
 
 void MainQueue::setWakeup(std::function<void()> wakeup) {

@@ -6,6 +6,7 @@
 
 #include <condition_variable>
 #include <deque>
+#include <exception>
 #include <functional>
 #include <mutex>
 #include <thread>
@@ -33,6 +34,9 @@ public:
     std::size_t drain();
     // Called (from the posting thread) after every post: the Qt front end schedules a drain.
     void setWakeup(std::function<void()> wakeup);
+    // Receives what a task throws, on the main thread; the queue then goes on with the next
+    // task. Without a handler the exception leaves run() or drain() (the process ends).
+    void setErrorHandler(std::function<void(std::exception_ptr)> handler);
 
     // The thread that runs the queue: the last to call run() or drain(), or the one that
     // claimed it.
@@ -41,10 +45,13 @@ public:
     [[nodiscard]] std::size_t pending() const;
 
 private:
+    void runTask(Task& task);
+
     mutable std::mutex mutex_;
     std::condition_variable wake_;
     std::deque<Task> tasks_;
     std::function<void()> wakeup_;
+    std::function<void(std::exception_ptr)> errorHandler_;
     std::thread::id owner_;
     bool stopping_ = false;
 };

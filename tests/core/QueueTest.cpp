@@ -3,6 +3,8 @@
 #include <atomic>
 #include <chrono>
 #include <mutex>
+#include <stdexcept>
+#include <string>
 #include <thread>
 #include <vector>
 
@@ -101,4 +103,28 @@ TEST(MainQueue, DrainRunsPendingTasksAndWakeupFiresOnPost) {
     EXPECT_EQ(q.drain(), 2U);
     EXPECT_EQ(ran, 2);
     EXPECT_TRUE(q.isCurrent());
+}
+
+TEST(MainQueue, ErrorHandlerReceivesWhatATaskThrowsAndTheQueueGoesOn) {
+    pyx::MainQueue q;
+    std::string caught;
+    q.setErrorHandler([&](std::exception_ptr e) {
+        try {
+            std::rethrow_exception(e);
+        } catch (const std::runtime_error& err) {
+            caught = err.what();
+        }
+    });
+    int ran = 0;
+    q.post([] { throw std::runtime_error("bad record"); });
+    q.post([&] { ++ran; });
+    EXPECT_EQ(q.drain(), 2U);
+    EXPECT_EQ(caught, "bad record");
+    EXPECT_EQ(ran, 1);
+}
+
+TEST(MainQueue, WithoutErrorHandlerAThrowingTaskEscapesDrain) {
+    pyx::MainQueue q;
+    q.post([] { throw std::runtime_error("unhandled"); });
+    EXPECT_THROW(q.drain(), std::runtime_error);
 }
