@@ -1,0 +1,19 @@
+// pyxonctl: command-line tools around the metric store.
+#include <vector>
+
+#include "tools/DecodeCommand.h"
+
+int main(int argc, char** argv) {
+    CLI::App pyxonctl{
+        "pyxonctl: tools around Pyxon's metric store.\n"
+        "Example: echo '{\"kKeyMetricID\": 3986178, \"kKeyPayload\": "
+        "\"08fbb0def7d32b12040814101e\"}' | pyxonctl decode",
+        "pyxonctl"};
+    pyxonctl.require_subcommand(1);
+    const std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl)};
+    CLI11_PARSE(pyxonctl, argc, argv);
+    for (const auto& subcommand : subcommands) {
+        if (subcommand.parser->parsed()) return subcommand.run();
+    }
+    return 1;
+}
