@@ -1,0 +1,616 @@
+#include "messages/MessageRuntime.h"
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "core/Format.h"
+#include "core/Log.h"
+#include "messages/KBBMetricUtility.h"
+#include "messages/PBRepeated.h"
+
+namespace pyx::detail {
+
+namespace {
+
+// ---- Typed views of a field's storage inside an opaque message. ----
+template <class T>
+T& at(void* message, const FieldDescriptor& f) {
+    return *reinterpret_cast<T*>(static_cast<char*>(message) + f.offset);
+}
+template <class T>
+const T& at(const void* message, const FieldDescriptor& f) {
+    return *reinterpret_cast<const T*>(static_cast<const char*>(message) + f.offset);
+}
+std::uint64_t& hasBits(const MessageDescriptor& d, void* message) {
+    return *reinterpret_cast<std::uint64_t*>(static_cast<char*>(message) + d.hasOffset);
+}
+std::uint64_t hasBits(const MessageDescriptor& d, const void* message) {
+    return *reinterpret_cast<const std::uint64_t*>(static_cast<const char*>(message) + d.hasOffset);
+}
+bool isSet(std::uint64_t bits, const FieldDescriptor& f) {
+    return (bits >> f.bit) & 1U;
+}
+void* slot(void* message, const FieldDescriptor& f) {
+    return static_cast<char*>(message) + f.offset;
+}
+const void* slot(const void* message, const FieldDescriptor& f) {
+    return static_cast<const char*>(message) + f.offset;
+}
+
+// A scalar's value widened to 64 bits (signed fields sign-extended), for hashing.
+std::uint64_t scalarBits(const void* message, const FieldDescriptor& f) {
+    switch (f.kind) {
+        case FieldKind::UInt64:
+            return at<std::uint64_t>(message, f);
+        case FieldKind::UInt32:
+            return at<std::uint32_t>(message, f);
+        case FieldKind::SInt32:
+        case FieldKind::Enum:
+            return static_cast<std::uint64_t>(
+                static_cast<std::int64_t>(at<std::int32_t>(message, f)));
+        case FieldKind::Bool:
+            return at<bool>(message, f) ? 1 : 0;
+        default:
+            return 0;
+    }
+}
+
+// Stores a varint read as a scalar of the field's declared type.
+void storeScalar(void* message, const FieldDescriptor& f, std::uint64_t v) {
+    switch (f.kind) {
+        case FieldKind::UInt64:
+            at<std::uint64_t>(message, f) = v;
+            break;
+        case FieldKind::UInt32:
+            at<std::uint32_t>(message, f) = static_cast<std::uint32_t>(v);
+            break;
+        case FieldKind::SInt32:
+            at<std::int32_t>(message, f) = decodeZigZag32(static_cast<std::uint32_t>(v));
+            break;
+        case FieldKind::Enum:
+            at<std::int32_t>(message, f) = static_cast<std::int32_t>(static_cast<std::uint32_t>(v));
+            break;
+        case FieldKind::Bool:
+            at<bool>(message, f) = v != 0;
+            break;
+        default:
+            break;
+    }
+}
+
+void copyScalar(const void* from, void* into, const FieldDescriptor& f) {
+    switch (f.kind) {
+        case FieldKind::UInt64:
+            at<std::uint64_t>(into, f) = at<std::uint64_t>(from, f);
+            break;
+        case FieldKind::UInt32:
+            at<std::uint32_t>(into, f) = at<std::uint32_t>(from, f);
+            break;
+        case FieldKind::SInt32:
+        case FieldKind::Enum:
+            at<std::int32_t>(into, f) = at<std::int32_t>(from, f);
+            break;
+        case FieldKind::Bool:
+            at<bool>(into, f) = at<bool>(from, f);
+            break;
+        default:
+            break;
+    }
+}
+
+// Reads one value of a repeated scalar (a varint, zigzag-decoded for sint32) and appends it.
+void appendListValue(void* message, const FieldDescriptor& f, std::uint64_t v) {
+    if (f.kind == FieldKind::UInt32List) {
+        at<PBRepeatedUInt32>(message, f).push_back(static_cast<std::uint32_t>(v));
+    } else {
+        at<PBRepeatedInt32>(message, f).push_back(decodeZigZag32(static_cast<std::uint32_t>(v)));
+    }
+}
+
+bool readNested(const SubMessageOps& ops, void* nested, PBDataReader& reader) {
+    PBDataReaderMark mark;
+    if (!PBReaderPlaceMark(reader, mark)) return false;
+    if (!readMessage(ops.descriptor(), nested, reader)) return false;
+    PBReaderRecallMark(reader, mark);
+    return true;
+}
+
+bool readRepeatedScalar(void* message, const FieldDescriptor& f, std::uint8_t wireType,
+                        PBDataReader& reader) {
+    if (wireType != kWireLengthDelimited) {
+        appendListValue(message, f, reader.readVarint());
+        return true;
+    }
+    PBDataReaderMark mark;
+    if (!PBReaderPlaceMark(reader, mark)) return false;
+    while (reader.hasMoreData()) appendListValue(message, f, reader.readVarint());
+    PBReaderRecallMark(reader, mark);
+    return true;
+}
+
+std::uint64_t hashBytes(const void* data, std::size_t size) {
+    std::uint64_t h = 0xcbf29ce484222325ULL;
+    const auto* p = static_cast<const std::uint8_t*>(data);
+    for (std::size_t i = 0; i < size; ++i) {
+        h ^= p[i];
+        h *= 0x100000001b3ULL;
+    }
+    return h;
+}
+
+constexpr std::uint64_t kHashMultiplier = 2654435761ULL;
+
+}  // namespace
+
+bool readMessage(const MessageDescriptor& d, void* message, PBDataReader& reader) {
+    std::uint64_t& has = hasBits(d, message);
+    while (reader.hasMoreData()) {
+        const std::uint64_t key = reader.readVarint();
+        const auto wireType = static_cast<std::uint8_t>(key & 7);
+        const auto tag = static_cast<std::uint16_t>(key >> 3);
+        if (reader.hasError() || wireType == kWireEndGroup) break;
+
+        if (KBBMetricUtility::isValidMetricIdTag(tag, d)) {
+            const std::uint64_t value = reader.readVarint();
+            systemLog(format("Unknown tag: %x:%u", static_cast<unsigned>(tag),
+                             static_cast<unsigned>(value & 0xFFFFFFFFU)));
+            continue;
+        }
+        const FieldDescriptor* f = d.fieldForTag(tag);
+        if (f == nullptr) {
+            if (!PBReaderSkipValueWithTag(reader, tag, wireType)) return false;
+            continue;
+        }
+        switch (f->kind) {
+            case FieldKind::UInt64:
+            case FieldKind::UInt32:
+            case FieldKind::SInt32:
+            case FieldKind::Enum:
+            case FieldKind::Bool:
+                has |= std::uint64_t{1} << f->bit;
+                storeScalar(message, *f, reader.readVarint());
+                break;
+            case FieldKind::Data:
+                at<std::optional<Bytes>>(message, *f) = PBReaderReadData(reader);
+                break;
+            case FieldKind::String:
+                at<std::optional<std::string>>(message, *f) = PBReaderReadString(reader);
+                break;
+            case FieldKind::Message:
+                // Stored before its length is checked: a bad length leaves it in place.
+                if (!readNested(*f->sub, f->sub->makeNew(slot(message, *f)), reader)) {
+                    return false;
+                }
+                break;
+            case FieldKind::MessageList:
+                has |= std::uint64_t{1} << f->bit;
+                if (!readNested(*f->sub, f->sub->appendNew(slot(message, *f)), reader)) {
+                    return false;
+                }
+                break;
+            case FieldKind::UInt32List:
+            case FieldKind::SInt32List:
+                if (!readRepeatedScalar(message, *f, wireType, reader)) return false;
+                break;
+        }
+    }
+    return !reader.hasError();
+}
+
+void writeMessage(const MessageDescriptor& d, const void* message, PBDataWriter& writer) {
+    const std::uint64_t has = hasBits(d, message);
+    for (const FieldDescriptor& f : d.fields) {
+        switch (f.kind) {
+            case FieldKind::UInt64:
+                if (isSet(has, f)) {
+                    PBDataWriterWriteUint64Field(writer, at<std::uint64_t>(message, f), f.tag);
+                }
+                break;
+            case FieldKind::UInt32:
+                if (isSet(has, f)) {
+                    PBDataWriterWriteUint32Field(writer, at<std::uint32_t>(message, f), f.tag);
+                }
+                break;
+            case FieldKind::SInt32:
+                if (isSet(has, f)) {
+                    PBDataWriterWriteSint32Field(writer, at<std::int32_t>(message, f), f.tag);
+                }
+                break;
+            case FieldKind::Enum:
+                if (isSet(has, f)) {
+                    PBDataWriterWriteInt32Field(writer, at<std::int32_t>(message, f), f.tag);
+                }
+                break;
+            case FieldKind::Bool:
+                if (isSet(has, f)) PBDataWriterWriteBOOLField(writer, at<bool>(message, f), f.tag);
+                break;
+            case FieldKind::Data:
+                if (const auto& v = at<std::optional<Bytes>>(message, f)) {
+                    PBDataWriterWriteDataField(writer, *v, f.tag);
+                }
+                break;
+            case FieldKind::String:
+                if (const auto& v = at<std::optional<std::string>>(message, f)) {
+                    PBDataWriterWriteStringField(writer, *v, f.tag);
+                }
+                break;
+            case FieldKind::Message:
+                if (const void* nested = f.sub->get(slot(message, f))) {
+                    PBDataWriterMark mark;
+                    PBDataWriterPlaceMark(writer, mark, f.tag);
+                    writeMessage(f.sub->descriptor(), nested, writer);
+                    PBDataWriterRecallMark(writer, mark, f.tag);
+                }
+                break;
+            case FieldKind::MessageList: {
+                const void* list = slot(message, f);
+                const std::size_t n = f.sub->count(list);
+                for (std::size_t i = 0; i < n; ++i) {
+                    PBDataWriterMark mark;
+                    PBDataWriterPlaceMark(writer, mark, f.tag);
+                    writeMessage(f.sub->descriptor(), f.sub->at(list, i), writer);
+                    PBDataWriterRecallMark(writer, mark, f.tag);
+                }
+                break;
+            }
+            case FieldKind::UInt32List: {
+                const auto& list = at<PBRepeatedUInt32>(message, f);
+                if (list.empty()) break;
+                PBDataWriterMark mark;
+                PBDataWriterPlaceMark(writer, mark, f.tag);
+                for (const std::uint32_t v : list) PBDataWriterWriteUint32Field(writer, v, kNoTag);
+                PBDataWriterRecallMark(writer, mark, f.tag);
+                break;
+            }
+            case FieldKind::SInt32List: {
+                const auto& list = at<PBRepeatedInt32>(message, f);
+                if (list.empty()) break;
+                PBDataWriterMark mark;
+                PBDataWriterPlaceMark(writer, mark, f.tag);
+                for (const std::int32_t v : list) PBDataWriterWriteSint32Field(writer, v, kNoTag);
+                PBDataWriterRecallMark(writer, mark, f.tag);
+                break;
+            }
+        }
+    }
+}
+
+Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
+    const std::uint64_t has = hasBits(d, message);
+    Dict dict;
+    dict.reserve(d.fields.size());
+    for (const FieldDescriptor& f : d.fields) {
+        switch (f.kind) {
+            case FieldKind::UInt64:
+                if (isSet(has, f)) dict.append(std::string(f.key), at<std::uint64_t>(message, f));
+                break;
+            case FieldKind::UInt32:
+                if (isSet(has, f)) dict.append(std::string(f.key), at<std::uint32_t>(message, f));
+                break;
+            case FieldKind::SInt32:
+                if (isSet(has, f)) dict.append(std::string(f.key), at<std::int32_t>(message, f));
+                break;
+            case FieldKind::Bool:
+                if (isSet(has, f)) dict.append(std::string(f.key), at<bool>(message, f));
+                break;
+            case FieldKind::Enum:
+                if (isSet(has, f)) {
+                    dict.append(std::string(f.key),
+                                f.enumTable->nameOf(at<std::int32_t>(message, f)));
+                }
+                break;
+            case FieldKind::Data:
+                if (const auto& v = at<std::optional<Bytes>>(message, f)) {
+                    dict.append(std::string(f.key), *v);
+                }
+                break;
+            case FieldKind::String:
+                if (const auto& v = at<std::optional<std::string>>(message, f)) {
+                    dict.append(std::string(f.key), *v);
+                }
+                break;
+            case FieldKind::Message:
+                if (const void* nested = f.sub->get(slot(message, f))) {
+                    dict.append(std::string(f.key), dictionaryOf(f.sub->descriptor(), nested));
+                }
+                break;
+            case FieldKind::MessageList: {
+                const void* list = slot(message, f);
+                const std::size_t n = f.sub->count(list);
+                if (n == 0) break;
+                Array values;
+                values.reserve(n);
+                const MessageDescriptor& nd = f.sub->descriptor();
+                for (std::size_t i = 0; i < n; ++i)
+                    values.emplace_back(dictionaryOf(nd, f.sub->at(list, i)));
+                dict.append(std::string(f.key), std::move(values));
+                break;
+            }
+            case FieldKind::UInt32List:
+                dict.append(std::string(f.key),
+                            PBRepeatedUInt32NSArray(at<PBRepeatedUInt32>(message, f)));
+                break;
+            case FieldKind::SInt32List:
+                dict.append(std::string(f.key),
+                            PBRepeatedInt32NSArray(at<PBRepeatedInt32>(message, f)));
+                break;
+        }
+    }
+    return dict;
+}
+
+std::string describeMessage(const MessageDescriptor& d, const void* message) {
+    std::string out =
+        format("<%.*s: %p> ", static_cast<int>(d.name.size()), d.name.data(), message);
+    Value(dictionaryOf(d, message)).appendDescription(out);
+    return out;
+}
+
+bool messagesEqual(const MessageDescriptor& d, const void* a, const void* b) {
+    // Scalars agree on presence, and message lists on having been created, in one comparison.
+    const std::uint64_t has = hasBits(d, a);
+    if (has != hasBits(d, b)) return false;
+    for (const FieldDescriptor& f : d.fields) {
+        switch (f.kind) {
+            case FieldKind::UInt64:
+            case FieldKind::UInt32:
+            case FieldKind::SInt32:
+            case FieldKind::Enum:
+            case FieldKind::Bool:
+                if (isSet(has, f) && scalarBits(a, f) != scalarBits(b, f)) return false;
+                break;
+            case FieldKind::Data:
+                if (at<std::optional<Bytes>>(a, f) != at<std::optional<Bytes>>(b, f)) return false;
+                break;
+            case FieldKind::String:
+                if (at<std::optional<std::string>>(a, f) != at<std::optional<std::string>>(b, f)) {
+                    return false;
+                }
+                break;
+            case FieldKind::Message: {
+                const void* na = f.sub->get(slot(a, f));
+                const void* nb = f.sub->get(slot(b, f));
+                if ((na == nullptr) != (nb == nullptr)) return false;
+                if (na != nullptr && na != nb && !messagesEqual(f.sub->descriptor(), na, nb)) {
+                    return false;
+                }
+                break;
+            }
+            case FieldKind::MessageList: {
+                const void* la = slot(a, f);
+                const void* lb = slot(b, f);
+                const std::size_t n = f.sub->count(la);
+                if (n != f.sub->count(lb)) return false;
+                const MessageDescriptor& nd = f.sub->descriptor();
+                for (std::size_t i = 0; i < n; ++i) {
+                    const void* ea = f.sub->at(la, i);
+                    const void* eb = f.sub->at(lb, i);
+                    if (ea != eb && !messagesEqual(nd, ea, eb)) return false;
+                }
+                break;
+            }
+            case FieldKind::UInt32List:
+                if (!PBRepeatedUInt32IsEqual(at<PBRepeatedUInt32>(a, f),
+                                             at<PBRepeatedUInt32>(b, f))) {
+                    return false;
+                }
+                break;
+            case FieldKind::SInt32List:
+                if (!PBRepeatedInt32IsEqual(at<PBRepeatedInt32>(a, f), at<PBRepeatedInt32>(b, f))) {
+                    return false;
+                }
+                break;
+        }
+    }
+    return true;
+}
+
+std::uint64_t messageHash(const MessageDescriptor& d, const void* message) {
+    const std::uint64_t has = hasBits(d, message);
+    std::uint64_t h = 0;
+    for (const FieldDescriptor& f : d.fields) {
+        switch (f.kind) {
+            case FieldKind::UInt64:
+            case FieldKind::UInt32:
+            case FieldKind::SInt32:
+            case FieldKind::Enum:
+            case FieldKind::Bool:
+                if (isSet(has, f)) h ^= scalarBits(message, f) * kHashMultiplier;
+                break;
+            case FieldKind::Data:
+                if (const auto& v = at<std::optional<Bytes>>(message, f)) {
+                    h ^= hashBytes(v->data(), v->size());
+                }
+                break;
+            case FieldKind::String:
+                if (const auto& v = at<std::optional<std::string>>(message, f)) {
+                    h ^= hashBytes(v->data(), v->size());
+                }
+                break;
+            case FieldKind::Message:
+                if (const void* nested = f.sub->get(slot(message, f))) {
+                    h ^= messageHash(f.sub->descriptor(), nested);
+                }
+                break;
+            case FieldKind::MessageList: {
+                // A list hashes as its length mixed with its elements' hashes, in order.
+                const void* list = slot(message, f);
+                const std::size_t n = f.sub->count(list);
+                std::uint64_t lh = n;
+                for (std::size_t i = 0; i < n; ++i) {
+                    lh = lh * 31 + messageHash(f.sub->descriptor(), f.sub->at(list, i));
+                }
+                h ^= lh;
+                break;
+            }
+            case FieldKind::UInt32List:
+                h ^= PBRepeatedUInt32Hash(at<PBRepeatedUInt32>(message, f));
+                break;
+            case FieldKind::SInt32List:
+                h ^= PBRepeatedInt32Hash(at<PBRepeatedInt32>(message, f));
+                break;
+        }
+    }
+    return h;
+}
+
+void mergeMessage(const MessageDescriptor& d, void* into, const void* from) {
+    const std::uint64_t fromHas = hasBits(d, from);
+    std::uint64_t& intoHas = hasBits(d, into);
+    for (const FieldDescriptor& f : d.fields) {
+        switch (f.kind) {
+            case FieldKind::UInt64:
+            case FieldKind::UInt32:
+            case FieldKind::SInt32:
+            case FieldKind::Enum:
+            case FieldKind::Bool:
+                if (isSet(fromHas, f)) {
+                    copyScalar(from, into, f);
+                    intoHas |= std::uint64_t{1} << f.bit;
+                }
+                break;
+            case FieldKind::Data:
+                if (const auto& v = at<std::optional<Bytes>>(from, f))
+                    at<std::optional<Bytes>>(into, f) = v;
+                break;
+            case FieldKind::String:
+                if (const auto& v = at<std::optional<std::string>>(from, f)) {
+                    at<std::optional<std::string>>(into, f) = v;
+                }
+                break;
+            case FieldKind::Message: {
+                const void* other = f.sub->get(slot(from, f));
+                if (other == nullptr) break;
+                if (void* mine = const_cast<void*>(f.sub->get(slot(into, f)))) {
+                    if (mine != other) mergeMessage(f.sub->descriptor(), mine, other);
+                } else {
+                    f.sub->share(slot(into, f), slot(from, f));
+                }
+                break;
+            }
+            case FieldKind::MessageList: {
+                const void* list = slot(from, f);
+                const std::size_t n = f.sub->count(list);
+                for (std::size_t i = 0; i < n; ++i) {
+                    f.sub->appendShared(slot(into, f), list, i);
+                    intoHas |= std::uint64_t{1} << f.bit;
+                }
+                break;
+            }
+            case FieldKind::UInt32List: {
+                const auto values = at<PBRepeatedUInt32>(from, f);  // a copy: from may be into
+                auto& list = at<PBRepeatedUInt32>(into, f);
+                list.insert(list.end(), values.begin(), values.end());
+                break;
+            }
+            case FieldKind::SInt32List: {
+                const auto values = at<PBRepeatedInt32>(from, f);
+                auto& list = at<PBRepeatedInt32>(into, f);
+                list.insert(list.end(), values.begin(), values.end());
+                break;
+            }
+        }
+    }
+}
+
+void shallowCopy(const MessageDescriptor& d, const void* from, void* into) {
+    if (from == into) return;
+    const std::uint64_t fromHas = hasBits(d, from);
+    std::uint64_t& intoHas = hasBits(d, into);
+    for (const FieldDescriptor& f : d.fields) {
+        switch (f.kind) {
+            case FieldKind::UInt64:
+            case FieldKind::UInt32:
+            case FieldKind::SInt32:
+            case FieldKind::Enum:
+            case FieldKind::Bool:
+                if (isSet(fromHas, f)) {
+                    copyScalar(from, into, f);
+                    intoHas |= std::uint64_t{1} << f.bit;
+                }
+                break;
+            case FieldKind::Data:
+                if (const auto& v = at<std::optional<Bytes>>(from, f))
+                    at<std::optional<Bytes>>(into, f) = v;
+                break;
+            case FieldKind::String:
+                if (const auto& v = at<std::optional<std::string>>(from, f)) {
+                    at<std::optional<std::string>>(into, f) = v;
+                }
+                break;
+            case FieldKind::Message:
+                if (f.sub->get(slot(from, f)) != nullptr)
+                    f.sub->share(slot(into, f), slot(from, f));
+                break;
+            case FieldKind::MessageList: {
+                const void* list = slot(from, f);
+                const std::size_t n = f.sub->count(list);
+                if (n == 0) break;
+                f.sub->clear(slot(into, f));
+                for (std::size_t i = 0; i < n; ++i) f.sub->appendShared(slot(into, f), list, i);
+                intoHas |= std::uint64_t{1} << f.bit;
+                break;
+            }
+            case FieldKind::UInt32List:
+                if (!at<PBRepeatedUInt32>(from, f).empty()) {
+                    at<PBRepeatedUInt32>(into, f) = at<PBRepeatedUInt32>(from, f);
+                }
+                break;
+            case FieldKind::SInt32List:
+                if (!at<PBRepeatedInt32>(from, f).empty()) {
+                    at<PBRepeatedInt32>(into, f) = at<PBRepeatedInt32>(from, f);
+                }
+                break;
+        }
+    }
+}
+
+void deepCopy(const MessageDescriptor& d, const void* from, void* into) {
+    const std::uint64_t fromHas = hasBits(d, from);
+    std::uint64_t& intoHas = hasBits(d, into);
+    for (const FieldDescriptor& f : d.fields) {
+        switch (f.kind) {
+            case FieldKind::UInt64:
+            case FieldKind::UInt32:
+            case FieldKind::SInt32:
+            case FieldKind::Enum:
+            case FieldKind::Bool:
+                if (isSet(fromHas, f)) {
+                    copyScalar(from, into, f);
+                    intoHas |= std::uint64_t{1} << f.bit;
+                }
+                break;
+            case FieldKind::Data:
+                at<std::optional<Bytes>>(into, f) = at<std::optional<Bytes>>(from, f);
+                break;
+            case FieldKind::String:
+                at<std::optional<std::string>>(into, f) = at<std::optional<std::string>>(from, f);
+                break;
+            case FieldKind::Message:
+                if (const void* nested = f.sub->get(slot(from, f))) {
+                    deepCopy(f.sub->descriptor(), nested, f.sub->makeNew(slot(into, f)));
+                }
+                break;
+            case FieldKind::MessageList: {
+                // Each element copied and appended; an empty list is not carried over.
+                const void* list = slot(from, f);
+                const std::size_t n = f.sub->count(list);
+                for (std::size_t i = 0; i < n; ++i) {
+                    deepCopy(f.sub->descriptor(), f.sub->at(list, i),
+                             f.sub->appendNew(slot(into, f)));
+                    intoHas |= std::uint64_t{1} << f.bit;
+                }
+                break;
+            }
+            case FieldKind::UInt32List:
+                at<PBRepeatedUInt32>(into, f) = at<PBRepeatedUInt32>(from, f);
+                break;
+            case FieldKind::SInt32List:
+                at<PBRepeatedInt32>(into, f) = at<PBRepeatedInt32>(from, f);
+                break;
+        }
+    }
+}
+
+}  // namespace pyx::detail
