@@ -17,6 +17,8 @@ class PBDataReader {
   public:
     explicit PBDataReader(std::span<const std::uint8_t> data)
         : bytes_(data.data()), length_(data.size()) {}
+    // The reader only views its bytes: a temporary buffer would be gone before the reading.
+    explicit PBDataReader(Bytes&&) = delete;
 
     [[nodiscard]] const std::uint8_t* bytes() const { return bytes_; }
     // The current limit: the end of the data, or of the nested record being read.
