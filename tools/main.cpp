@@ -2,6 +2,9 @@
 #include <vector>
 
 #include "tools/DecodeCommand.h"
+#ifdef PYXON_HAVE_SCREEN_COMMAND
+#include "tools/ScreenCommand.h"
+#endif
 
 int main(int argc, char** argv) {
     CLI::App pyxonctl{
@@ -10,7 +13,10 @@ int main(int argc, char** argv) {
         "\"08fbb0def7d32b12040814101e\"}' | pyxonctl decode",
         "pyxonctl"};
     pyxonctl.require_subcommand(1);
-    const std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl)};
+    std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl)};
+#ifdef PYXON_HAVE_SCREEN_COMMAND
+    subcommands.push_back(pyx::addScreenCommand(pyxonctl));
+#endif
     CLI11_PARSE(pyxonctl, argc, argv);
     for (const auto& subcommand : subcommands) {
         if (subcommand.parser->parsed()) return subcommand.run();
