@@ -43,18 +43,19 @@ std::string decodeLine(MetricValidator& validator, std::string_view line) {
     } catch (const RecordError& error) {
         return errorLine(error.metricID(), error.reason());
     }
-    bool stored = false;
     try {
-        stored = validator.isMetricIDValidWithMetricdict(record);
+        // The application's path: the delegate call, "Received Valid Metric" included.
+        validator.metricsDidUpdate(record);
     } catch (const MetricRejected& rejection) {
         return errorLine(rejection.metricID(), rejection.reason());
     }
 
+    // A record that was not refused is stored exactly when its kind is decoded.
     const auto& id = validator.metricID();
     Json out = Json::object();
     out["metric"] = metricText(id);
     const MetricKind* kind = id ? findMetricKind(*id) : nullptr;
-    if (!stored || kind == nullptr || !kind->property) {
+    if (kind == nullptr || !kind->decodable()) {
         out["ignored"] = true;
         return dumped(out);
     }
@@ -93,7 +94,7 @@ Subcommand addDecodeCommand(CLI::App& pyxonctl) {
         "a refused record or a line that is not a record gives\n"
         "{\"metric\":\"0x3CD302\" or null,\"error\":\"what was wrong\"}. The store's own log "
         "lines\n"
-        "go to stderr. The exit code is 0 once all input is read.");
+        "go to stderr. The exit code is 0 once all input is read.\n");
     return Subcommand{decode, [] {
                           standardOutputSink().redirect(stderr);
                           return runDecode(std::cin, std::cout);
