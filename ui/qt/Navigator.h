@@ -1,0 +1,113 @@
+// The navigation stack behind the window: launch list -> first-level menu -> category screen
+// -> third-level placeholder. It creates the controllers, hands each selection forward as the
+// screens define, and tells the view what was pushed and popped; the view mirrors it.
+#pragma once
+
+#include <QObject>
+#include <QString>
+#include <QStringList>
+
+#include <memory>
+#include <vector>
+
+#include "metrics/MetricValidator.h"
+#include "ui/TableController.h"
+#include "ui/qt/TableModel.h"
+
+namespace pyx::qt {
+
+// One screen on the stack: its controller, the model the view draws, and its title.
+class Screen : public QObject {
+    Q_OBJECT
+    Q_PROPERTY(QString title READ title CONSTANT)
+    Q_PROPERTY(pyx::qt::TableModel* model READ model CONSTANT)
+    Q_PROPERTY(int level READ level CONSTANT)
+    Q_PROPERTY(bool refreshes READ refreshes CONSTANT)
+    Q_PROPERTY(bool leadsFurther READ leadsFurther CONSTANT)
+
+  public:
+    enum Level { Launch = 0, FirstLevel = 1, SecondLevel = 2, ThirdLevel = 3 };
+    Q_ENUM(Level)
+
+    Screen(Level level, QString title, std::shared_ptr<TableController> controller,
+           QObject* parent = nullptr);
+
+    [[nodiscard]] QString title() const { return title_; }
+    [[nodiscard]] TableModel* model() const { return model_; }
+    [[nodiscard]] int level() const { return level_; }
+    // The category screen follows the store: the view reloads it periodically.
+    [[nodiscard]] bool refreshes() const { return level_ == SecondLevel; }
+    // Whether tapping a row opens a further screen.
+    [[nodiscard]] bool leadsFurther() const { return level_ != ThirdLevel; }
+    [[nodiscard]] TableController& controller() const { return *controller_; }
+
+    // The periodic refresh: posts one reload of the table to the main queue.
+    Q_INVOKABLE void update();
+
+  private:
+    Level level_;
+    QString title_;
+    std::shared_ptr<TableController> controller_;
+    TableModel* model_;
+};
+
+class Navigator : public QObject {
+    Q_OBJECT
+    Q_PROPERTY(int depth READ depth NOTIFY depthChanged)
+    Q_PROPERTY(pyx::qt::Screen* current READ current NOTIFY depthChanged)
+    Q_PROPERTY(int refreshIntervalMs READ refreshIntervalMs WRITE setRefreshIntervalMs NOTIFY
+                   refreshIntervalMsChanged)
+    Q_PROPERTY(bool animated READ animated WRITE setAnimated NOTIFY animatedChanged)
+
+  public:
+    // validator: the store the category screens read.
+    explicit Navigator(std::shared_ptr<MetricValidator> validator, QObject* parent = nullptr);
+    ~Navigator() override;
+
+    [[nodiscard]] int depth() const { return static_cast<int>(stack_.size()); }
+    [[nodiscard]] Screen* current() const { return stack_.back(); }
+    Q_INVOKABLE pyx::qt::Screen* screenAt(int level) const;
+
+    // How often an open category screen reloads (5000 ms; tests shorten it).
+    [[nodiscard]] int refreshIntervalMs() const { return refreshIntervalMs_; }
+    void setRefreshIntervalMs(int ms);
+    // Whether the view animates pushes and pops (off while taking screenshots).
+    [[nodiscard]] bool animated() const { return animated_; }
+    void setAnimated(bool animated);
+
+    // The tap on item index of the top screen: pushes the next screen. False for a header,
+    // an index out of range, or the deepest screen.
+    Q_INVOKABLE bool select(int index);
+    // Pops the top screen; false on the launch list.
+    Q_INVOKABLE bool back();
+    Q_INVOKABLE void popToRoot();
+    // From the launch list, taps the rows whose texts are titles, in order ("LTE", "C-DRX").
+    // Stops and answers false at the first title the screen does not show.
+    Q_INVOKABLE bool open(const QStringList& titles);
+
+    // The view calls this once its root screen has loaded; the first call emits
+    // rootViewDidLoad, later calls do nothing.
+    Q_INVOKABLE void rootViewLoaded();
+    // The view calls this when a popped screen has left it; the screen is then deleted.
+    Q_INVOKABLE void release(pyx::qt::Screen* screen);
+
+  signals:
+    void pushed(pyx::qt::Screen* screen);
+    void popped();
+    void depthChanged();
+    void rootViewDidLoad();
+    void refreshIntervalMsChanged();
+    void animatedChanged();
+
+  private:
+    void push(Screen* screen);
+
+    std::shared_ptr<MetricValidator> validator_;
+    std::vector<Screen*> stack_;    // children of the navigator, launch list first
+    std::vector<Screen*> retired_;  // popped, still drawn by the view until it releases them
+    int refreshIntervalMs_ = 5000;
+    bool animated_ = true;
+    bool rootViewLoaded_ = false;
+};
+
+}  // namespace pyx::qt

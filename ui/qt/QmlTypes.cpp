@@ -1,0 +1,22 @@
+#include "ui/qt/QmlTypes.h"
+
+#include <QQmlEngine>
+
+#include <mutex>
+
+#include "ui/qt/Navigator.h"
+#include "ui/qt/TableModel.h"
+
+namespace pyx::qt {
+
+void registerQmlTypes() {
+    static std::once_flag once;
+    std::call_once(once, [] {
+        const QString made = QStringLiteral("made by the navigator");
+        qmlRegisterUncreatableType<Navigator>("Pyxon", 1, 0, "Navigator", made);
+        qmlRegisterUncreatableType<Screen>("Pyxon", 1, 0, "Screen", made);
+        qmlRegisterUncreatableType<TableModel>("Pyxon", 1, 0, "TableModel", made);
+    });
+}
+
+}  // namespace pyx::qt

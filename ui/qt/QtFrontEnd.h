@@ -1,0 +1,25 @@
+// The window: the Qt Quick front end that the pyxon program runs when a display is there.
+#pragma once
+
+#include <functional>
+#include <optional>
+#include <string>
+
+namespace pyx {
+
+struct WindowOptions {
+    // When set: after screenshotDelayMs, render the launch list, each group's menu and every
+    // category screen of the menu to PNG files in this folder, then quit with 0.
+    std::optional<std::string> screenshotDir;
+    int screenshotDelayMs = 3000;
+};
+
+// Creates the application, lets its event loop drain the main queue, shows the window, calls
+// rootViewDidLoad once the launch list has loaded, and returns the event loop's exit status.
+int runWindow(int& argc, char** argv, const WindowOptions& options,
+              std::function<void()> rootViewDidLoad);
+
+// False when there is neither an X11 nor a Wayland display and the platform is not offscreen.
+bool displayAvailable();
+
+}  // namespace pyx
