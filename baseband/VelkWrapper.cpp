@@ -139,9 +139,13 @@ void VelkWrapper::listen() {
                              kHandlerName, record.description().c_str()));
             // With no delegate at this moment, the event ends here.
             if (!self->impl_->currentDelegate()) return;
-            self->impl_->mainQueue.post([self, kind, record = std::move(record)] {
+            // The task holds the wrapper weakly too, so that a wrapper that goes away (at the
+            // latest when the process ends) takes its manager and event delivery with it.
+            self->impl_->mainQueue.post([weak, kind, record = std::move(record)] {
+                const std::shared_ptr<VelkWrapper> wrapper = weak.lock();
+                if (!wrapper) return;
                 const std::shared_ptr<VelkWrapperDelegate> delegate =
-                    self->impl_->currentDelegate();
+                    wrapper->impl_->currentDelegate();
                 if (!delegate) return;
                 // What the delegate throws goes to the main queue's error handler.
                 if (kind == EventKind::Trigger) {

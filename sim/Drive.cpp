@@ -105,6 +105,7 @@ Drive::Drive(std::uint64_t seed) : random_(seed) {
 
     s.rrcState = kLteRrcIdle;
     s.prevRrcState = kLteRrcNull;
+    s.rrcCause = kCauseReleaseOther;
     s.phaseLengthMs = static_cast<std::uint64_t>(random_.between(8'000, 20'000));
 
     // Two neighbours of each technology to begin with; more come and go as the drive goes on.

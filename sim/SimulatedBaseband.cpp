@@ -83,9 +83,9 @@ velk::Result SimulatedBaseband::addConfiguration(const Dict& input) {
             const std::lock_guard lock(timelineMutex_);
             timeline_.configure(std::move(config));
         }
-        return velk::Result(
-            velk::kCodeSuccess,
-            format("configuration accepted: %zu metrics, %zu triggers", metrics, triggers));
+        return velk::Result(velk::kCodeSuccess,
+                            format("configuration accepted: %zu metric%s, %zu trigger%s", metrics,
+                                   metrics == 1 ? "" : "s", triggers, triggers == 1 ? "" : "s"));
     } catch (const ConfigurationError& error) {
         return velk::Result(velk::kCodeBadConfiguration, error.what());
     }

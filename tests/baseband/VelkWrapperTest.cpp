@@ -329,6 +329,21 @@ TEST_F(VelkWrapperTest, EventsStopWhenTheWrapperIsGone) {
     EXPECT_TRUE(delegate->metrics().empty());
 }
 
+TEST_F(VelkWrapperTest, AHandedOverEventDoesNotKeepTheWrapperAlive) {
+    const auto delegate = std::make_shared<RecordingDelegate>();
+    wrapper_->setDelegate(delegate);
+    wrapper_->listen();
+    transport_->emit(velk::kEventMetric, metricEvent(1));
+    pyx::VelkWrapper::queue().waitIdle();
+    ASSERT_EQ(mainQueue_.pending(), 1U);
+    const std::weak_ptr<pyx::VelkWrapper> watch = wrapper_;
+    wrapper_.reset();
+    EXPECT_TRUE(watch.expired());
+    EXPECT_FALSE(transport_->delivering());
+    mainQueue_.drain();
+    EXPECT_TRUE(delegate->metrics().empty());
+}
+
 TEST(VelkWrapperQueue, TheSerialQueueIsCreatedOncePerProcessWithItsLabel) {
     pyx::SerialQueue& first = pyx::VelkWrapper::queue();
     pyx::SerialQueue& second = pyx::VelkWrapper::queue();

@@ -120,7 +120,7 @@ TEST(SimulatedBaseband, TheShippedConfigurationIsAccepted) {
     SimulatedBaseband sim(fast(1));
     const velk::Result result = push(sim, pyx::testing::shippedConfigurationText());
     EXPECT_EQ(result.code, 0);
-    EXPECT_EQ(result.message, "configuration accepted: 32 metrics, 1 triggers");
+    EXPECT_EQ(result.message, "configuration accepted: 32 metrics, 1 trigger");
     EXPECT_TRUE(sim.configured());
 }
 
