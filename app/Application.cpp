@@ -1,0 +1,170 @@
+#include "app/Application.h"
+
+#include <pthread.h>
+#include <CLI/CLI.hpp>
+
+#include <atomic>
+#include <csignal>
+#include <cstdint>
+#include <iostream>
+#include <optional>
+#include <string>
+#include <thread>
+
+#include "app/AppDelegate.h"
+#include "app/RootNavigationController.h"
+#include "baseband/VelkWrapper.h"
+#include "baseband/velk/Client.h"
+#include "core/Format.h"
+#include "core/Log.h"
+#include "core/MainQueue.h"
+#include "metrics/MetricValidator.h"
+#include "sim/SimulatedBaseband.h"
+#ifdef PYXON_HAVE_WINDOW
+#include "ui/qt/QtFrontEnd.h"
+#endif
+
+namespace pyx {
+namespace {
+
+struct Options {
+    bool headless = false;
+    std::uint64_t seed = 1;
+    double speed = 1.0;
+    std::optional<std::string> screenshots;
+};
+
+// SIGINT and SIGTERM are blocked in every thread (set before any thread starts) and taken by
+// one waiting thread, which stops the main queue; the queue then runs what is still queued.
+class StopOnSignal {
+  public:
+    StopOnSignal() {
+        sigemptyset(&signals_);
+        sigaddset(&signals_, SIGINT);
+        sigaddset(&signals_, SIGTERM);
+        pthread_sigmask(SIG_BLOCK, &signals_, nullptr);
+        waiter_ = std::thread([this] {
+            int signal = 0;
+            sigwait(&signals_, &signal);
+            if (!done_) MainQueue::shared().stop();
+        });
+    }
+    ~StopOnSignal() {
+        done_ = true;
+        pthread_kill(waiter_.native_handle(), SIGTERM);
+        waiter_.join();
+    }
+    StopOnSignal(const StopOnSignal&) = delete;
+    StopOnSignal& operator=(const StopOnSignal&) = delete;
+
+  private:
+    sigset_t signals_{};
+    std::atomic<bool> done_{false};
+    std::thread waiter_;
+};
+
+// A record the store refuses is reported in one line and counted; the program goes on.
+void reportRejectedRecords(std::uint64_t& rejected) {
+    MainQueue::shared().setErrorHandler([&rejected](std::exception_ptr error) {
+        try {
+            std::rethrow_exception(error);
+        } catch (const MetricRejected& rejection) {
+            ++rejected;
+            const std::string id =
+                rejection.metricID()
+                    ? format("0x%llX", static_cast<unsigned long long>(*rejection.metricID()))
+                    : std::string("(none)");
+            systemLog(format("pyxon: rejected metric record %s: %s", id.c_str(),
+                             rejection.reason().c_str()));
+        }
+    });
+}
+
+int runHeadless(RootNavigationController& root) {
+    MainQueue& mainQueue = MainQueue::shared();
+    mainQueue.claimCurrentThread();
+    root.viewDidLoad();
+    mainQueue.run();
+    return 0;
+}
+
+}  // namespace
+
+int runPyxon(int argc, char** argv) {
+    CLI::App cli{
+        "Pyxon shows what the baseband reports: serving cell, neighbours, RRC state, transmit\n"
+        "power, carrier aggregation, NAS contexts, bearers and SIM files. It runs on the\n"
+        "built-in simulated baseband.",
+        "pyxon"};
+    Options options;
+    cli.add_flag("--headless", options.headless,
+                 "No window: print the system's lines as events arrive, until SIGINT or SIGTERM");
+    cli.add_option("--seed", options.seed, "Seed of the simulated baseband's drive")
+        ->capture_default_str();
+    cli.add_option("--speed", options.speed,
+                   "Speed factor of the simulated baseband (2 = events twice as often)")
+        ->check(CLI::PositiveNumber)
+        ->capture_default_str();
+    cli.add_option("--screenshots", options.screenshots,
+                   "Render every screen to PNG files in this folder, then quit")
+        ->type_name("DIR");
+    cli.set_version_flag("--version", std::string("pyxon ") + PYXON_VERSION);
+    cli.footer("Example: pyxon --headless --speed 20");
+    try {
+        cli.parse(argc, argv);
+    } catch (const CLI::CallForHelp& e) {
+        return cli.exit(e);
+    } catch (const CLI::CallForVersion& e) {
+        return cli.exit(e);
+    } catch (const CLI::ParseError& e) {
+        std::cerr << "pyxon: " << e.what() << "\nRun with --help for more information.\n";
+        return 2;
+    }
+
+#ifdef PYXON_HAVE_WINDOW
+    const bool window = !options.headless && (options.screenshots || displayAvailable());
+    if (!options.headless && !window) systemLog("pyxon: no display available, running headless");
+#else
+    const bool window = false;
+    if (!options.headless) systemLog("pyxon: built without the window, running headless");
+#endif
+    if (options.screenshots && !window) {
+        std::cerr << "pyxon: --screenshots needs the window\n";
+        return 2;
+    }
+
+    std::optional<StopOnSignal> stopOnSignal;
+    if (!window) stopOnSignal.emplace();
+
+    std::uint64_t rejected = 0;
+    reportRejectedRecords(rejected);
+
+    velk::client::SetTransportFactory([seed = options.seed, speed = options.speed] {
+        return std::make_shared<sim::SimulatedBaseband>(
+            sim::SimulatedBaseband::Options{seed, speed, std::nullopt});
+    });
+
+    AppDelegate appDelegate;
+    appDelegate.applicationDidFinishLaunchingWithOptions(Dict{});
+
+    // Creation order: the client's shared instance, then the store's (which listens and then
+    // becomes the delegate), then the start-up sequence once the root view has loaded.
+    RootNavigationController root;
+
+    int status = 0;
+#ifdef PYXON_HAVE_WINDOW
+    if (window) {
+        WindowOptions windowOptions;
+        windowOptions.screenshotDir = options.screenshots;
+        status = runWindow(argc, argv, windowOptions, [&root] { root.viewDidLoad(); });
+    } else {
+        status = runHeadless(root);
+    }
+#else
+    status = runHeadless(root);
+#endif
+    appDelegate.applicationWillTerminate();
+    return status;
+}
+
+}  // namespace pyx

@@ -1,0 +1,28 @@
+#include "app/Bundle.h"
+
+#include <system_error>
+
+namespace pyx {
+
+Bundle Bundle::mainBundle() {
+    std::error_code ec;
+    const auto exe = std::filesystem::read_symlink("/proc/self/exe", ec);
+    if (!ec) {
+        const auto installed = exe.parent_path().parent_path() / PYXON_INSTALL_DATADIR;
+        if (std::filesystem::is_directory(installed, ec)) return Bundle(installed);
+    }
+    return Bundle(PYXON_SOURCE_RESOURCES);
+}
+
+std::optional<std::string> Bundle::pathForResource(std::string_view name,
+                                                   std::string_view type) const {
+    std::string file(name);
+    file += '.';
+    file += type;
+    const auto path = resourcePath_ / file;
+    std::error_code ec;
+    if (!std::filesystem::is_regular_file(path, ec)) return std::nullopt;
+    return path.string();
+}
+
+}  // namespace pyx

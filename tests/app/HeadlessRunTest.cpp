@@ -1,0 +1,197 @@
+// Runs the pyxon program as a new user would, headless on the simulated baseband, and checks
+// what it prints and how it ends.
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <csignal>
+#include <cstdio>
+#include <cstdlib>
+#include <mutex>
+#include <set>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace {
+
+struct Child {
+    pid_t pid = -1;
+    int out = -1;
+    int err = -1;
+};
+
+Child spawn(const std::vector<std::string>& args) {
+    int outPipe[2];
+    int errPipe[2];
+    if (pipe(outPipe) != 0 || pipe(errPipe) != 0) return {};
+    const pid_t pid = fork();
+    if (pid == 0) {
+        dup2(outPipe[1], STDOUT_FILENO);
+        dup2(errPipe[1], STDERR_FILENO);
+        close(outPipe[0]);
+        close(errPipe[0]);
+        std::vector<char*> argv;
+        for (const auto& a : args) argv.push_back(const_cast<char*>(a.c_str()));
+        argv.push_back(nullptr);
+        execv(argv[0], argv.data());
+        _exit(127);
+    }
+    close(outPipe[1]);
+    close(errPipe[1]);
+    return Child{pid, outPipe[0], errPipe[0]};
+}
+
+// Reads everything the child writes on one descriptor, in a thread, line by line.
+class LineCollector {
+  public:
+    explicit LineCollector(int fd) : thread_([this, fd] { read(fd); }) {}
+    ~LineCollector() { thread_.join(); }
+    LineCollector(const LineCollector&) = delete;
+    LineCollector& operator=(const LineCollector&) = delete;
+
+    std::vector<std::string> lines() {
+        const std::lock_guard lock(mutex_);
+        return lines_;
+    }
+
+  private:
+    void read(int fd) {
+        std::FILE* f = fdopen(fd, "r");
+        char* line = nullptr;
+        std::size_t cap = 0;
+        ssize_t n;
+        while ((n = getline(&line, &cap, f)) > 0) {
+            std::string s(line, static_cast<std::size_t>(n));
+            if (!s.empty() && s.back() == '\n') s.pop_back();
+            const std::lock_guard lock(mutex_);
+            lines_.push_back(std::move(s));
+        }
+        free(line);  // NOLINT: getline's buffer
+        std::fclose(f);
+    }
+    std::mutex mutex_;
+    std::vector<std::string> lines_;
+    std::thread thread_;
+};
+
+const std::vector<std::string> kArrivalPrefixes = {
+    "Current CDRX Config is ",
+    "Current RRC state is ",
+    "Current Serving Cell Info is ",
+    "Received LTE Cell Resel Info is ",
+    "Received LTE Tx Power is ",
+    "Received RSRP RSRQ SINR is : ",
+    "Received Component Carrier info is ",
+    "Received CA Status Dict is ",
+    "Received LTE InterRat Meas Info is ",
+    "Received LTE IRAT Meas is ",
+    "Received Secondary Cell Measurement Dict is ",
+    "Received MM Common Info Dict is : ",
+    "Received Bearer Context Info is ",
+    "Received EMM Context is ",
+    "Received MM Context Info is ",
+    "Received GMM Context Info is ",
+    "Received UMTS RRC Connection State is ",
+    "Received UMTS RRC Configuration is ",
+    "Received UMTS Serving Cell Info is ",
+    "Received UMTS Serving Cell Meas is ",
+    "Received Tx Power is ",
+    "Received UMTS Cell Resel Info is ",
+    "Received UMTS InterRat Meas Info is ",
+    "Received GSM Serving Cell Info ",
+    "Received GSM Idle Config Info is ",
+    "Received GSM Idle Serving Cell Meas Info is ",
+    "Received GSM Connected Serving Cell Meas Info is ",
+    "Received GSM Nbr Cell Meas Info is ",
+    "Received GSM GPRS Config Info is ",
+    "Received SIM Card File Info is ",
+};
+
+bool startsWith(const std::string& s, const std::string& prefix) {
+    return s.compare(0, prefix.size(), prefix) == 0;
+}
+
+// What a new user's run must show; returns what is still missing.
+std::vector<std::string> missingLines(const std::vector<std::string>& lines) {
+    std::vector<std::string> missing;
+    const auto has = [&](const std::string& exact) {
+        for (const auto& l : lines)
+            if (l == exact) return true;
+        return false;
+    };
+    const auto hasPrefix = [&](const std::string& prefix) {
+        for (const auto& l : lines)
+            if (startsWith(l, prefix)) return true;
+        return false;
+    };
+    for (const char* exact :
+         {"pushing metric file", "Querying SIM files", "Metric ID in Hex = 3C0013",
+          "Received Valid Metric", "I dont care for this Metric", "I dont care for events"})
+        if (!has(exact)) missing.emplace_back(exact);
+    for (const auto& prefix : kArrivalPrefixes)
+        if (!hasPrefix(prefix)) missing.push_back(prefix + "...");
+    return missing;
+}
+
+}  // namespace
+
+TEST(PyxonHeadless, ShowsEveryKindOnTheSimulatedBasebandAndExitsCleanlyOnSigterm) {
+    Child child = spawn({PYXON_BINARY, "--headless", "--speed", "20"});
+    ASSERT_GT(child.pid, 0);
+    std::vector<std::string> out;
+    {
+        LineCollector stdoutLines(child.out);
+        LineCollector stderrLines(child.err);
+        // Wait, bounded, until everything has shown up (not a timing assertion: a slow machine
+        // only takes longer).
+        for (int i = 0; i < 1200 && !missingLines(stdoutLines.lines()).empty(); ++i)
+            std::this_thread::sleep_for(std::chrono::milliseconds(100));
+        ASSERT_EQ(kill(child.pid, SIGTERM), 0);
+        int status = 0;
+        ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
+        ASSERT_TRUE(WIFEXITED(status)) << "ended by signal " << WTERMSIG(status);
+        EXPECT_EQ(WEXITSTATUS(status), 0);
+        out = stdoutLines.lines();
+        for (const auto& line : stderrLines.lines())
+            EXPECT_EQ(line.find("rejected"), std::string::npos) << line;
+    }
+    const auto missing = missingLines(out);
+    for (const auto& m : missing) ADD_FAILURE() << "never printed: " << m;
+}
+
+TEST(PyxonOptions, UnknownOptionIsAUsageErrorWithStatusTwo) {
+    Child child = spawn({PYXON_BINARY, "--no-such-option"});
+    ASSERT_GT(child.pid, 0);
+    std::vector<std::string> err;
+    {
+        LineCollector o(child.out);
+        LineCollector e(child.err);
+        int status = 0;
+        ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
+        ASSERT_TRUE(WIFEXITED(status));
+        EXPECT_EQ(WEXITSTATUS(status), 2);
+        err = e.lines();
+    }
+    ASSERT_FALSE(err.empty());
+    EXPECT_NE(err.front().find("no-such-option"), std::string::npos) << err.front();
+}
+
+TEST(PyxonOptions, VersionAndHelpExitZero) {
+    for (const char* option : {"--version", "--help"}) {
+        Child child = spawn({PYXON_BINARY, option});
+        ASSERT_GT(child.pid, 0);
+        std::vector<std::string> out;
+        {
+            LineCollector o(child.out);
+            LineCollector e(child.err);
+            int status = 0;
+            ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
+            ASSERT_TRUE(WIFEXITED(status));
+            EXPECT_EQ(WEXITSTATUS(status), 0) << option;
+            out = o.lines();
+        }
+        ASSERT_FALSE(out.empty()) << option;
+    }
+}
