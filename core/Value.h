@@ -31,16 +31,23 @@ public:
     using const_iterator = Entries::const_iterator;
     using iterator = Entries::iterator;
 
-    Dict() = default;
+    // The special members, like the accessors below, are defined after DictEntry, where the
+    // entry type is complete (clang instantiates the vector's members where they are used).
+    Dict();
+    ~Dict();
+    Dict(const Dict& other);
+    Dict(Dict&& other) noexcept;
+    Dict& operator=(const Dict& other);
+    Dict& operator=(Dict&& other) noexcept;
     Dict(std::initializer_list<DictEntry> entries);
 
-    [[nodiscard]] std::size_t size() const { return entries_.size(); }
-    [[nodiscard]] bool empty() const { return entries_.empty(); }
-    [[nodiscard]] const_iterator begin() const { return entries_.begin(); }
-    [[nodiscard]] const_iterator end() const { return entries_.end(); }
-    [[nodiscard]] iterator begin() { return entries_.begin(); }
-    [[nodiscard]] iterator end() { return entries_.end(); }
-    [[nodiscard]] const DictEntry& at(std::size_t index) const { return entries_.at(index); }
+    [[nodiscard]] std::size_t size() const;
+    [[nodiscard]] bool empty() const;
+    [[nodiscard]] const_iterator begin() const;
+    [[nodiscard]] const_iterator end() const;
+    [[nodiscard]] iterator begin();
+    [[nodiscard]] iterator end();
+    [[nodiscard]] const DictEntry& at(std::size_t index) const;
 
     // The value under key, or nullptr when the key is absent.
     [[nodiscard]] const Value* find(std::string_view key) const;
@@ -53,7 +60,7 @@ public:
     Value& append(std::string key, Value value);
     // Removes the key if present; returns whether it was.
     bool erase(std::string_view key);
-    void reserve(std::size_t n) { entries_.reserve(n); }
+    void reserve(std::size_t n);
 
     friend bool operator==(const Dict& a, const Dict& b);
 
@@ -128,6 +135,21 @@ struct DictEntry {
     Value value;
     friend bool operator==(const DictEntry& a, const DictEntry& b) = default;
 };
+
+inline Dict::Dict() = default;
+inline Dict::~Dict() = default;
+inline Dict::Dict(const Dict& other) = default;
+inline Dict::Dict(Dict&& other) noexcept = default;
+inline Dict& Dict::operator=(const Dict& other) = default;
+inline Dict& Dict::operator=(Dict&& other) noexcept = default;
+inline std::size_t Dict::size() const { return entries_.size(); }
+inline bool Dict::empty() const { return entries_.empty(); }
+inline Dict::const_iterator Dict::begin() const { return entries_.begin(); }
+inline Dict::const_iterator Dict::end() const { return entries_.end(); }
+inline Dict::iterator Dict::begin() { return entries_.begin(); }
+inline Dict::iterator Dict::end() { return entries_.end(); }
+inline const DictEntry& Dict::at(std::size_t index) const { return entries_.at(index); }
+inline void Dict::reserve(std::size_t n) { entries_.reserve(n); }
 
 // The shortest text that reads back as the same float, always with a decimal point
 // ("20.0", "-2.5", "1.4"); exponent forms, infinities and NaN as std::to_chars gives them.
