@@ -38,14 +38,23 @@ Rectangle {
         anchors { fill: parent; leftMargin: 16; rightMargin: item.chevron ? 30 : 16 }
 
         readonly property real spacing: 12
+        // The main text takes what it needs when both fit on one line; otherwise it keeps at
+        // least 45% of the width and both wrap.
         readonly property real keyWidth: item.detailText.length === 0
                                          ? width
-                                         : Math.min(mainMetrics.advanceWidth + 1, width * 0.55)
+                                         : Math.min(mainMetrics.advanceWidth + 1,
+                                                    Math.max(width * 0.45,
+                                                             width - detailMetrics.advanceWidth - 1 - spacing))
 
         TextMetrics {
             id: mainMetrics
             font: mainLabel.font
             text: item.mainText
+        }
+        TextMetrics {
+            id: detailMetrics
+            font: detailLabel.font
+            text: item.detailText
         }
 
         Text {
