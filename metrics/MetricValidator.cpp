@@ -30,6 +30,32 @@ std::size_t indexOf(MetricValidator::DictionaryProperty p) {
     return static_cast<std::size_t>(p);
 }
 
+// "Metric ID in Hex = " and the ID as "%2X" formats it: taken as a 32-bit unsigned integer
+// (every catalogued ID fits), upper-case hex digits, blank-padded to two characters. Written
+// by hand because it runs for every record.
+class HexLine {
+  public:
+    explicit HexLine(std::int64_t id) {
+        constexpr std::string_view prefix = "Metric ID in Hex = ";
+        prefix.copy(text_, prefix.size());
+        char digits[8];
+        int n = 0;
+        auto value = static_cast<std::uint32_t>(id);
+        do {
+            digits[n++] = "0123456789ABCDEF"[value & 0xF];
+            value >>= 4;
+        } while (value != 0);
+        size_ = prefix.size();
+        if (n < 2) text_[size_++] = ' ';
+        while (n > 0) text_[size_++] = digits[--n];
+    }
+    operator std::string_view() const { return {text_, size_}; }
+
+  private:
+    char text_[32] = {};
+    std::size_t size_ = 0;
+};
+
 // The arrival line: the kind's prefix, then the stored dictionary's description.
 void appendDictionaryDescription(std::string& out, const Dict& dict) {
     out += '{';
@@ -75,10 +101,7 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     }
     const std::int64_t id = *self.metricID_;
 
-    // "%2X" takes the ID as a 32-bit unsigned integer; every catalogued ID fits.
-    char hexLine[48];
-    std::snprintf(hexLine, sizeof hexLine, "Metric ID in Hex = %2X", static_cast<unsigned>(id));
-    standardOutput(hexLine);
+    standardOutput(HexLine(id));
 
     const MetricKind* kind = findMetricKind(id);
     if (kind == nullptr || !kind->decodable()) {
@@ -138,7 +161,9 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     update.commit();
 
     const auto& now = self.dictionary(property);
-    std::string line(kind->logPrefix);
+    std::string line;
+    line.reserve(kind->logPrefix.size() + 256);
+    line += kind->logPrefix;
     if (now) appendDictionaryDescription(line, *now);
     standardOutput(line);
     return true;
