@@ -58,6 +58,9 @@ public:
     Value& set(std::string key, Value value);
     // Appends without looking for an existing key; for builders that know keys are unique.
     Value& append(std::string key, Value value);
+    // As append, building the entry in place: the key is copied once and the value moved
+    // once (the decoders build every dictionary this way).
+    Value& emplace(std::string_view key, Value&& value);
     // Removes the key if present; returns whether it was.
     bool erase(std::string_view key);
     void reserve(std::size_t n);
@@ -150,6 +153,12 @@ inline Dict::iterator Dict::begin() { return entries_.begin(); }
 inline Dict::iterator Dict::end() { return entries_.end(); }
 inline const DictEntry& Dict::at(std::size_t index) const { return entries_.at(index); }
 inline void Dict::reserve(std::size_t n) { entries_.reserve(n); }
+inline Value& Dict::emplace(std::string_view key, Value&& value) {
+    DictEntry& entry = entries_.emplace_back();
+    entry.key.assign(key.data(), key.size());
+    entry.value = std::move(value);
+    return entry.value;
+}
 
 // The shortest text that reads back as the same float, always with a decimal point
 // ("20.0", "-2.5", "1.4"); exponent forms, infinities and NaN as std::to_chars gives them.

@@ -73,6 +73,17 @@ TEST(ValueDict, SetReplacesInPlaceAndEraseRemoves) {
     EXPECT_EQ(d.find("zzz"), nullptr);
 }
 
+TEST(ValueDict, EmplaceAppendsAnEntryBuiltInPlace) {
+    Dict d{{"a", Value(1)}};
+    const std::string longKey = "mo_signalling_ac_barring_for_special_ac";
+    Value& stored = d.emplace(longKey, Value(Array{Value(2), Value(3)}));
+    EXPECT_EQ(stored, Value(Array{Value(2), Value(3)}));
+    d.emplace("b", Value("text"));
+    EXPECT_EQ(d, (Dict{{"a", Value(1)},
+                       {longKey, Value(Array{Value(2), Value(3)})},
+                       {"b", Value("text")}}));
+}
+
 TEST(ValueDict, EqualityIsOrderSensitive) {
     Dict a{{"x", Value(1)}, {"y", Value(2)}};
     Dict b{{"y", Value(2)}, {"x", Value(1)}};
