@@ -607,7 +607,6 @@ void BM_Decode(benchmark::State& state) {
     }
     state.SetBytesProcessed(static_cast<std::int64_t>(state.iterations()) *
                             static_cast<std::int64_t>(payload.size()));
-    state.counters["payload_bytes"] = static_cast<double>(payload.size());
 }
 
 template <class T>

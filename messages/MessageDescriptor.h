@@ -124,7 +124,10 @@ inline constexpr SubMessageOps kSubMessageOps = {
         return (*static_cast<const ListSlot<T>*>(list))[i].get();
     },
     [](void* list) -> void* {
-        return static_cast<ListSlot<T>*>(list)->emplace_back(std::make_shared<T>()).get();
+        auto& l = *static_cast<ListSlot<T>*>(list);
+        // Lists are short: start at four elements rather than growing through 1, 2 and 4.
+        if (l.size() == l.capacity()) l.reserve(l.empty() ? 4 : 2 * l.size());
+        return l.emplace_back(std::make_shared<T>()).get();
     },
     [](void* dst, const void* src, std::size_t i) {
         static_cast<ListSlot<T>*>(dst)->push_back((*static_cast<const ListSlot<T>*>(src))[i]);

@@ -56,29 +56,6 @@ std::uint64_t scalarBits(const void* message, const FieldDescriptor& f) {
     }
 }
 
-// Stores a varint read as a scalar of the field's declared type.
-void storeScalar(void* message, const FieldDescriptor& f, std::uint64_t v) {
-    switch (f.kind) {
-        case FieldKind::UInt64:
-            at<std::uint64_t>(message, f) = v;
-            break;
-        case FieldKind::UInt32:
-            at<std::uint32_t>(message, f) = static_cast<std::uint32_t>(v);
-            break;
-        case FieldKind::SInt32:
-            at<std::int32_t>(message, f) = decodeZigZag32(static_cast<std::uint32_t>(v));
-            break;
-        case FieldKind::Enum:
-            at<std::int32_t>(message, f) = static_cast<std::int32_t>(static_cast<std::uint32_t>(v));
-            break;
-        case FieldKind::Bool:
-            at<bool>(message, f) = v != 0;
-            break;
-        default:
-            break;
-    }
-}
-
 void copyScalar(const void* from, void* into, const FieldDescriptor& f) {
     switch (f.kind) {
         case FieldKind::UInt64:
@@ -124,6 +101,14 @@ bool readRepeatedScalar(void* message, const FieldDescriptor& f, std::uint8_t wi
     }
     PBDataReaderMark mark;
     if (!PBReaderPlaceMark(reader, mark)) return false;
+    // Each value takes at least one byte: the record's length bounds the count.
+    if (f.kind == FieldKind::UInt32List) {
+        auto& list = at<PBRepeatedUInt32>(message, f);
+        list.reserve(list.size() + reader.remaining());
+    } else {
+        auto& list = at<PBRepeatedInt32>(message, f);
+        list.reserve(list.size() + reader.remaining());
+    }
     while (reader.hasMoreData()) appendListValue(message, f, reader.readVarint());
     PBReaderRecallMark(reader, mark);
     return true;
@@ -144,58 +129,98 @@ constexpr std::uint64_t kHashMultiplier = 2654435761ULL;
 }  // namespace
 
 bool readMessage(const MessageDescriptor& d, void* message, PBDataReader& reader) {
-    std::uint64_t& has = hasBits(d, message);
-    while (reader.hasMoreData()) {
-        const std::uint64_t key = reader.readVarint();
+    // Plain values are read on local copies of the cursor and of the presence bits (so that
+    // storing a field does not make the compiler reload the reader); the reader is brought up to
+    // date around everything that goes through it.
+    char* const base = static_cast<char*>(message);
+    const FieldDescriptor* const fields = d.fields.data();
+    const std::uint8_t* const tagIndex = d.tagIndex.data();
+    const std::size_t tagCount = d.tagIndex.size();
+    const std::uint8_t* const bytes = reader.bytes();
+    const std::size_t limit = reader.length();
+    std::size_t pos = reader.position();
+    bool error = reader.hasError();
+    std::uint64_t has = hasBits(d, message);
+
+    const auto handOver = [&] { reader.setPosition(pos); };
+    const auto takeBack = [&] {
+        pos = reader.position();
+        error = reader.hasError();
+    };
+    const auto finish = [&](bool ok) {
+        hasBits(d, message) = has;
+        reader.setPosition(pos);
+        if (error) reader.setError();
+        return ok;
+    };
+
+    while (pos < limit && !error) {
+        const std::uint64_t key = decodeVarint(bytes, pos, limit, error);
         const auto wireType = static_cast<std::uint8_t>(key & 7);
         const auto tag = static_cast<std::uint16_t>(key >> 3);
-        if (reader.hasError() || wireType == kWireEndGroup) break;
+        if (error || wireType == kWireEndGroup) break;
 
         if (KBBMetricUtility::isValidMetricIdTag(tag, d)) {
-            const std::uint64_t value = reader.readVarint();
+            const std::uint64_t value = decodeVarint(bytes, pos, limit, error);
             systemLog(format("Unknown tag: %x:%u", static_cast<unsigned>(tag),
                              static_cast<unsigned>(value & 0xFFFFFFFFU)));
             continue;
         }
-        const FieldDescriptor* f = d.fieldForTag(tag);
-        if (f == nullptr) {
-            if (!PBReaderSkipValueWithTag(reader, tag, wireType)) return false;
+        const std::uint8_t index = tag < tagCount ? tagIndex[tag] : MessageDescriptor::kNoField;
+        if (index == MessageDescriptor::kNoField) {
+            handOver();
+            const bool skipped = PBReaderSkipValueWithTag(reader, tag, wireType);
+            takeBack();
+            if (!skipped) return finish(false);
             continue;
         }
-        switch (f->kind) {
-            case FieldKind::UInt64:
-            case FieldKind::UInt32:
-            case FieldKind::SInt32:
-            case FieldKind::Enum:
-            case FieldKind::Bool:
-                has |= std::uint64_t{1} << f->bit;
-                storeScalar(message, *f, reader.readVarint());
-                break;
+        const FieldDescriptor& f = fields[index];
+        if (f.isScalar()) {
+            // The common case, kept free of a jump table: a varint whatever the wire type,
+            // stored at the field's width.
+            const std::uint64_t v = decodeVarint(bytes, pos, limit, error);
+            has |= std::uint64_t{1} << f.bit;
+            char* const p = base + f.offset;
+            if (f.kind == FieldKind::UInt64) {
+                *reinterpret_cast<std::uint64_t*>(p) = v;
+            } else if (f.kind == FieldKind::Bool) {
+                *reinterpret_cast<bool*>(p) = v != 0;
+            } else {
+                const auto low = static_cast<std::uint32_t>(v);
+                *reinterpret_cast<std::uint32_t*>(p) =
+                    f.kind == FieldKind::SInt32 ? static_cast<std::uint32_t>(decodeZigZag32(low))
+                                                : low;
+            }
+            continue;
+        }
+        handOver();
+        bool ok = true;
+        switch (f.kind) {
             case FieldKind::Data:
-                at<std::optional<Bytes>>(message, *f) = PBReaderReadData(reader);
+                at<std::optional<Bytes>>(message, f) = PBReaderReadData(reader);
                 break;
             case FieldKind::String:
-                at<std::optional<std::string>>(message, *f) = PBReaderReadString(reader);
+                at<std::optional<std::string>>(message, f) = PBReaderReadString(reader);
                 break;
             case FieldKind::Message:
                 // Stored before its length is checked: a bad length leaves it in place.
-                if (!readNested(*f->sub, f->sub->makeNew(slot(message, *f)), reader)) {
-                    return false;
-                }
+                ok = readNested(*f.sub, f.sub->makeNew(slot(message, f)), reader);
                 break;
             case FieldKind::MessageList:
-                has |= std::uint64_t{1} << f->bit;
-                if (!readNested(*f->sub, f->sub->appendNew(slot(message, *f)), reader)) {
-                    return false;
-                }
+                has |= std::uint64_t{1} << f.bit;
+                ok = readNested(*f.sub, f.sub->appendNew(slot(message, f)), reader);
                 break;
             case FieldKind::UInt32List:
             case FieldKind::SInt32List:
-                if (!readRepeatedScalar(message, *f, wireType, reader)) return false;
+                ok = readRepeatedScalar(message, f, wireType, reader);
+                break;
+            default:
                 break;
         }
+        takeBack();
+        if (!ok) return finish(false);
     }
-    return !reader.hasError();
+    return finish(!error);
 }
 
 void writeMessage(const MessageDescriptor& d, const void* message, PBDataWriter& writer) {
@@ -283,36 +308,35 @@ Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
     for (const FieldDescriptor& f : d.fields) {
         switch (f.kind) {
             case FieldKind::UInt64:
-                if (isSet(has, f)) dict.append(std::string(f.key), at<std::uint64_t>(message, f));
+                if (isSet(has, f)) dict.emplace(f.key, at<std::uint64_t>(message, f));
                 break;
             case FieldKind::UInt32:
-                if (isSet(has, f)) dict.append(std::string(f.key), at<std::uint32_t>(message, f));
+                if (isSet(has, f)) dict.emplace(f.key, at<std::uint32_t>(message, f));
                 break;
             case FieldKind::SInt32:
-                if (isSet(has, f)) dict.append(std::string(f.key), at<std::int32_t>(message, f));
+                if (isSet(has, f)) dict.emplace(f.key, at<std::int32_t>(message, f));
                 break;
             case FieldKind::Bool:
-                if (isSet(has, f)) dict.append(std::string(f.key), at<bool>(message, f));
+                if (isSet(has, f)) dict.emplace(f.key, at<bool>(message, f));
                 break;
             case FieldKind::Enum:
                 if (isSet(has, f)) {
-                    dict.append(std::string(f.key),
-                                f.enumTable->nameOf(at<std::int32_t>(message, f)));
+                    dict.emplace(f.key, f.enumTable->nameOf(at<std::int32_t>(message, f)));
                 }
                 break;
             case FieldKind::Data:
                 if (const auto& v = at<std::optional<Bytes>>(message, f)) {
-                    dict.append(std::string(f.key), *v);
+                    dict.emplace(f.key, *v);
                 }
                 break;
             case FieldKind::String:
                 if (const auto& v = at<std::optional<std::string>>(message, f)) {
-                    dict.append(std::string(f.key), *v);
+                    dict.emplace(f.key, *v);
                 }
                 break;
             case FieldKind::Message:
                 if (const void* nested = f.sub->get(slot(message, f))) {
-                    dict.append(std::string(f.key), dictionaryOf(f.sub->descriptor(), nested));
+                    dict.emplace(f.key, dictionaryOf(f.sub->descriptor(), nested));
                 }
                 break;
             case FieldKind::MessageList: {
@@ -324,16 +348,14 @@ Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
                 const MessageDescriptor& nd = f.sub->descriptor();
                 for (std::size_t i = 0; i < n; ++i)
                     values.emplace_back(dictionaryOf(nd, f.sub->at(list, i)));
-                dict.append(std::string(f.key), std::move(values));
+                dict.emplace(f.key, std::move(values));
                 break;
             }
             case FieldKind::UInt32List:
-                dict.append(std::string(f.key),
-                            PBRepeatedUInt32NSArray(at<PBRepeatedUInt32>(message, f)));
+                dict.emplace(f.key, PBRepeatedUInt32NSArray(at<PBRepeatedUInt32>(message, f)));
                 break;
             case FieldKind::SInt32List:
-                dict.append(std::string(f.key),
-                            PBRepeatedInt32NSArray(at<PBRepeatedInt32>(message, f)));
+                dict.emplace(f.key, PBRepeatedInt32NSArray(at<PBRepeatedInt32>(message, f)));
                 break;
         }
     }

@@ -9,14 +9,15 @@ struct PBDataReaderAccess {
     static std::size_t& pos(PBDataReader& r) { return r.pos_; }
 };
 
-std::uint64_t PBDataReader::readVarintSlow() {
+std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
+                               bool& error) {
     std::uint64_t value = 0;
     for (unsigned i = 0; i < 10; ++i) {
-        if (pos_ >= length_) {
-            error_ = true;
+        if (pos >= limit) {
+            error = true;
             return 0;
         }
-        const std::uint8_t byte = bytes_[pos_++];
+        const std::uint8_t byte = bytes[pos++];
         value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
         if ((byte & 0x80) == 0) return value;
     }

@@ -32,10 +32,10 @@ class PBDataReader {
 
     // A base-128 varint, least significant group first. Reading past the limit sets the
     // error flag and gives 0; ten bytes without a final byte give 0 (the ten are consumed).
-    std::uint64_t readVarint() {
-        if (pos_ < length_ && bytes_[pos_] < 0x80) return bytes_[pos_++];
-        return readVarintSlow();
-    }
+    std::uint64_t readVarint();
+
+    // For a decoder that keeps the position in a local while it reads plain values.
+    void setPosition(std::size_t position) { pos_ = position; }
 
     // Moves the position forward by n bytes; past the limit it sets the error flag instead.
     bool skip(std::size_t n);
@@ -51,6 +51,34 @@ class PBDataReader {
     std::size_t pos_ = 0;
     bool error_ = false;
 };
+
+// The varint decoder behind PBDataReader::readVarint, on a position and limit held by the
+// caller: one- and two-byte values (keys, most field values) take no loop.
+std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
+                               bool& error);
+
+inline std::uint64_t decodeVarint(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
+                                  bool& error) {
+    if (limit - pos >= 2) {
+        const std::uint8_t b0 = bytes[pos];
+        if (b0 < 0x80) {
+            ++pos;
+            return b0;
+        }
+        const std::uint8_t b1 = bytes[pos + 1];
+        if (b1 < 0x80) {
+            pos += 2;
+            return (b0 & 0x7FU) | (static_cast<std::uint64_t>(b1) << 7);
+        }
+    } else if (pos < limit && bytes[pos] < 0x80) {
+        return bytes[pos++];
+    }
+    return decodeVarintSlow(bytes, pos, limit, error);
+}
+
+inline std::uint64_t PBDataReader::readVarint() {
+    return decodeVarint(bytes_, pos_, length_, error_);
+}
 
 // The outer limit saved while a nested record is read.
 struct PBDataReaderMark {
