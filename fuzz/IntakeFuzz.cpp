@@ -5,7 +5,7 @@
 // Input: the first byte picks the shape of the record, the rest is its payload.
 //   0-31  the metric ID of that catalogue entry, the payload as data
 //   32    a signed ID from the next 8 bytes (little endian), then the payload
-//   33    an unsigned ID from the next 8 bytes
+//   33    an unsigned ID from the next 8 bytes (little endian)
 //   34    no metric ID at all
 //   35    the ID of catalogue entry (next byte % 32) as text
 //   36    the ID of catalogue entry (next byte % 32) as a floating-point number
@@ -19,6 +19,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <limits>
 #include <optional>
 #include <span>
 #include <string>
@@ -106,7 +107,12 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         kind = pyx::findMetricKind(id);
         record.append("kKeyMetricID", Value(id));
     } else if (shape == 33) {
-        record.append("kKeyMetricID", Value(littleEndian(rest)));
+        // An unsigned integer is an integer ID too, when it fits in 64 signed bits.
+        const std::uint64_t id = littleEndian(rest);
+        if (id <= static_cast<std::uint64_t>(std::numeric_limits<std::int64_t>::max())) {
+            kind = pyx::findMetricKind(static_cast<std::int64_t>(id));
+        }
+        record.append("kKeyMetricID", Value(id));
     } else if (shape == 34) {
         // no metric ID
     } else {
