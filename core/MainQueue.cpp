@@ -21,9 +21,9 @@ void MainQueue::post(Task task) {
 void MainQueue::run() {
     std::unique_lock lock(mutex_);
     owner_ = std::this_thread::get_id();
-    for (;;) {
+    while (!stopping_) {
         wake_.wait(lock, [this] { return stopping_ || !tasks_.empty(); });
-        if (tasks_.empty()) break;  // stopping, and nothing left
+        if (stopping_) break;
         Task task = std::move(tasks_.front());
         tasks_.pop_front();
         lock.unlock();
@@ -31,7 +31,13 @@ void MainQueue::run() {
         task = nullptr;
         lock.lock();
     }
+    // Stopped: run what was queued up to now, not what keeps arriving meanwhile, so that a
+    // busy producer cannot hold the loop open.
+    std::deque<Task> rest;
+    rest.swap(tasks_);
     stopping_ = false;
+    lock.unlock();
+    for (auto& task : rest) runTask(task);
 }
 
 void MainQueue::stop() {

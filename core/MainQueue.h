@@ -26,7 +26,7 @@ public:
 
     void post(Task task);
     // Runs tasks on the calling thread, which becomes the main thread, until stop(); then runs
-    // what is still queued and returns.
+    // the tasks queued at that moment and returns.
     void run();
     // Safe from any thread, also from a task.
     void stop();

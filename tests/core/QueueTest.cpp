@@ -128,3 +128,19 @@ TEST(MainQueue, WithoutErrorHandlerAThrowingTaskEscapesDrain) {
     q.post([] { throw std::runtime_error("unhandled"); });
     EXPECT_THROW(q.drain(), std::runtime_error);
 }
+
+TEST(MainQueue, StopRunsWhatWasQueuedButNotWhatKeepsArriving) {
+    pyx::MainQueue q;
+    int ran = 0;
+    std::function<void()> producer;
+    producer = [&] {
+        ++ran;
+        q.post(producer);  // a source that never lets the queue run empty
+    };
+    q.post(producer);
+    q.post([&] { q.stop(); });
+    q.run();
+    EXPECT_GE(ran, 1);
+    EXPECT_LE(ran, 3);
+    EXPECT_GE(q.pending(), 1U);
+}
