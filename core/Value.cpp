@@ -77,16 +77,47 @@ std::optional<float> Value::toFloat() const {
     }
 }
 
-std::string formatFloat(float value) {
-    char buf[64];
+namespace {
+
+constexpr char kHex[] = "0123456789abcdef";
+
+// The appenders below write straight into the caller's text: descriptions are built for every
+// stored record (its arrival line), so no temporary strings are made per value.
+template <class Int>
+void appendInteger(std::string& out, Int value) {
+    char buf[24];
     const auto res = std::to_chars(buf, buf + sizeof buf, value);
-    std::string text(buf, res.ptr);
-    if (std::isfinite(value) && text.find_first_of(".e") == std::string::npos) text += ".0";
-    return text;
+    out.append(buf, res.ptr);
 }
 
-namespace {
-constexpr char kHex[] = "0123456789abcdef";
+void appendFloat(std::string& out, float value) {
+    char buf[64];
+    const auto res = std::to_chars(buf, buf + sizeof buf, value);
+    const std::string_view text(buf, static_cast<std::size_t>(res.ptr - buf));
+    out.append(text);
+    if (std::isfinite(value) && text.find_first_of(".e") == std::string_view::npos) out += ".0";
+}
+
+void appendBytes(std::string& out, const Bytes& bytes) {
+    const std::size_t n = bytes.size();
+    const std::size_t start = out.size();
+    out.resize(start + 2 + n * 2 + (n == 0 ? 0 : (n - 1) / 4));
+    char* p = out.data() + start;
+    *p++ = '<';
+    for (std::size_t i = 0; i < n; ++i) {
+        if (i != 0 && i % 4 == 0) *p++ = ' ';
+        *p++ = kHex[bytes[i] >> 4];
+        *p++ = kHex[bytes[i] & 0xF];
+    }
+    *p = '>';
+}
+
+}  // namespace
+
+std::string formatFloat(float value) {
+    std::string text;
+    appendFloat(text, value);
+    return text;
 }
 
 std::string hexString(const Bytes& bytes) {
@@ -101,14 +132,7 @@ std::string hexString(const Bytes& bytes) {
 
 std::string describeBytes(const Bytes& bytes) {
     std::string out;
-    out.reserve(2 + bytes.size() * 2 + bytes.size() / 4);
-    out.push_back('<');
-    for (std::size_t i = 0; i < bytes.size(); ++i) {
-        if (i != 0 && i % 4 == 0) out.push_back(' ');
-        out.push_back(kHex[bytes[i] >> 4]);
-        out.push_back(kHex[bytes[i] & 0xF]);
-    }
-    out.push_back('>');
+    appendBytes(out, bytes);
     return out;
 }
 
@@ -116,11 +140,11 @@ void Value::appendDescription(std::string& out) const {
     switch (kind()) {
         case Kind::Null: out += "(null)"; break;
         case Kind::Bool: out += asBool() ? '1' : '0'; break;
-        case Kind::Int: out += std::to_string(asInt()); break;
-        case Kind::UInt: out += std::to_string(asUInt()); break;
-        case Kind::Float: out += formatFloat(asFloat()); break;
+        case Kind::Int: appendInteger(out, asInt()); break;
+        case Kind::UInt: appendInteger(out, asUInt()); break;
+        case Kind::Float: appendFloat(out, asFloat()); break;
         case Kind::String: out += asString(); break;
-        case Kind::Data: out += describeBytes(asBytes()); break;
+        case Kind::Data: appendBytes(out, asBytes()); break;
         case Kind::List: {
             out += '[';
             bool first = true;
