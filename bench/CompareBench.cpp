@@ -21,6 +21,12 @@ std::vector<Subject> subjectsOf(const std::vector<CorpusRecord>& corpus) {
     for (const CorpusRecord& r : corpus) {
         if (r.large) subjects.push_back(Subject{r.label, {&r}});
     }
+    // The simulated stream alone, as the app sees it, then everything.
+    Subject realistic{"realistic", {}};
+    for (const CorpusRecord& r : corpus) {
+        if (!r.large) realistic.records.push_back(&r);
+    }
+    subjects.push_back(std::move(realistic));
     Subject all{"corpus", {}};
     for (const CorpusRecord& r : corpus) all.records.push_back(&r);
     subjects.push_back(std::move(all));

@@ -18,7 +18,8 @@ struct Subject {
     std::vector<const CorpusRecord*> records;
 };
 
-// Per kind (the realistic records of each class), per large record, and the whole corpus.
+// Per kind (the realistic records of each class), per large record, all realistic records
+// ("realistic") and the whole corpus ("corpus", last).
 [[nodiscard]] std::vector<Subject> subjectsOf(const std::vector<CorpusRecord>& corpus);
 
 // Typed decode and bytes to dictionary, ours against libprotobuf.
