@@ -17,6 +17,10 @@ class Bundle {
 
     // The bundle of the running program.
     static Bundle mainBundle();
+    // The bundle of the program at programPath: share/pyxon under its prefix when that folder
+    // exists, otherwise fallback.
+    static Bundle forProgram(const std::filesystem::path& programPath,
+                             const std::filesystem::path& fallback);
 
     // The path of the resource "name.type", if that file exists.
     [[nodiscard]] std::optional<std::string> pathForResource(std::string_view name,

@@ -147,4 +147,17 @@ TEST(ResourceBundle, FindsTheMetricConfigurationInTheSourceResources) {
     EXPECT_FALSE(bundle.pathForResource("oru_test_lte", "nothing").has_value());
 }
 
+TEST(ResourceBundle, InstalledProgramUsesShareFolderUnderItsPrefix) {
+    const auto prefix = std::filesystem::temp_directory_path() / "pyxon-bundle-test";
+    std::filesystem::remove_all(prefix);
+    std::filesystem::create_directories(prefix / "bin");
+    const auto program = prefix / "bin" / "pyxon";
+    EXPECT_EQ(Bundle::forProgram(program, "/fallback").resourcePath(), "/fallback")
+        << "no installed resources: the source tree's";
+    std::filesystem::create_directories(prefix / PYXON_INSTALL_DATADIR);
+    EXPECT_EQ(Bundle::forProgram(program, "/fallback").resourcePath(),
+              prefix / PYXON_INSTALL_DATADIR);
+    std::filesystem::remove_all(prefix);
+}
+
 }  // namespace
