@@ -93,6 +93,22 @@ bool readNested(const SubMessageOps& ops, void* nested, PBDataReader& reader) {
     return true;
 }
 
+// The values of a packed record, up to the reader's limit or an error (a value that could not be
+// read is appended as 0, as readVarint gives it). The cursor is kept in locals for the loop:
+// lists of a thousand values are common enough to matter.
+template <class List, class Convert>
+void readPackedValues(List& list, PBDataReader& reader, Convert convert) {
+    const std::uint8_t* const bytes = reader.bytes();
+    const std::size_t limit = reader.length();
+    std::size_t pos = reader.position();
+    bool error = false;
+    // Each value takes at least one byte: the record's length bounds the count.
+    list.reserve(list.size() + (limit - pos));
+    while (pos < limit && !error) list.push_back(convert(decodeVarint(bytes, pos, limit, error)));
+    reader.setPosition(pos);
+    if (error) reader.setError();
+}
+
 bool readRepeatedScalar(void* message, const FieldDescriptor& f, std::uint8_t wireType,
                         PBDataReader& reader) {
     if (wireType != kWireLengthDelimited) {
@@ -101,15 +117,14 @@ bool readRepeatedScalar(void* message, const FieldDescriptor& f, std::uint8_t wi
     }
     PBDataReaderMark mark;
     if (!PBReaderPlaceMark(reader, mark)) return false;
-    // Each value takes at least one byte: the record's length bounds the count.
     if (f.kind == FieldKind::UInt32List) {
-        auto& list = at<PBRepeatedUInt32>(message, f);
-        list.reserve(list.size() + reader.remaining());
+        readPackedValues(at<PBRepeatedUInt32>(message, f), reader,
+                         [](std::uint64_t v) { return static_cast<std::uint32_t>(v); });
     } else {
-        auto& list = at<PBRepeatedInt32>(message, f);
-        list.reserve(list.size() + reader.remaining());
+        readPackedValues(at<PBRepeatedInt32>(message, f), reader, [](std::uint64_t v) {
+            return decodeZigZag32(static_cast<std::uint32_t>(v));
+        });
     }
-    while (reader.hasMoreData()) appendListValue(message, f, reader.readVarint());
     PBReaderRecallMark(reader, mark);
     return true;
 }
