@@ -141,6 +141,34 @@ std::uint64_t hashBytes(const void* data, std::size_t size) {
 
 constexpr std::uint64_t kHashMultiplier = 2654435761ULL;
 
+// Takes a present scalar (value and presence bit), bytes or text of field f from `from` into
+// `into`; what copying and merging share. Other kinds are left to the caller.
+void takePresentValue(const FieldDescriptor& f, const void* from, void* into, std::uint64_t fromHas,
+                      std::uint64_t& intoHas) {
+    switch (f.kind) {
+        case FieldKind::UInt64:
+        case FieldKind::UInt32:
+        case FieldKind::SInt32:
+        case FieldKind::Enum:
+        case FieldKind::Bool:
+            if (isSet(fromHas, f)) {
+                copyScalar(from, into, f);
+                intoHas |= std::uint64_t{1} << f.bit;
+            }
+            break;
+        case FieldKind::Data:
+            if (const auto& v = at<std::optional<Bytes>>(from, f))
+                at<std::optional<Bytes>>(into, f) = v;
+            break;
+        case FieldKind::String:
+            if (const auto& v = at<std::optional<std::string>>(from, f))
+                at<std::optional<std::string>>(into, f) = v;
+            break;
+        default:
+            break;
+    }
+}
+
 }  // namespace
 
 bool readMessage(const MessageDescriptor& d, void* message, PBDataReader& reader) {
@@ -497,24 +525,9 @@ void mergeMessage(const MessageDescriptor& d, void* into, const void* from) {
     std::uint64_t& intoHas = hasBits(d, into);
     for (const FieldDescriptor& f : d.fields) {
         switch (f.kind) {
-            case FieldKind::UInt64:
-            case FieldKind::UInt32:
-            case FieldKind::SInt32:
-            case FieldKind::Enum:
-            case FieldKind::Bool:
-                if (isSet(fromHas, f)) {
-                    copyScalar(from, into, f);
-                    intoHas |= std::uint64_t{1} << f.bit;
-                }
-                break;
-            case FieldKind::Data:
-                if (const auto& v = at<std::optional<Bytes>>(from, f))
-                    at<std::optional<Bytes>>(into, f) = v;
-                break;
-            case FieldKind::String:
-                if (const auto& v = at<std::optional<std::string>>(from, f)) {
-                    at<std::optional<std::string>>(into, f) = v;
-                }
+            default:
+                // Scalars, bytes and text: present values are taken, the same in every copy.
+                takePresentValue(f, from, into, fromHas, intoHas);
                 break;
             case FieldKind::Message: {
                 const void* other = f.sub->get(slot(from, f));
@@ -557,24 +570,9 @@ void shallowCopy(const MessageDescriptor& d, const void* from, void* into) {
     std::uint64_t& intoHas = hasBits(d, into);
     for (const FieldDescriptor& f : d.fields) {
         switch (f.kind) {
-            case FieldKind::UInt64:
-            case FieldKind::UInt32:
-            case FieldKind::SInt32:
-            case FieldKind::Enum:
-            case FieldKind::Bool:
-                if (isSet(fromHas, f)) {
-                    copyScalar(from, into, f);
-                    intoHas |= std::uint64_t{1} << f.bit;
-                }
-                break;
-            case FieldKind::Data:
-                if (const auto& v = at<std::optional<Bytes>>(from, f))
-                    at<std::optional<Bytes>>(into, f) = v;
-                break;
-            case FieldKind::String:
-                if (const auto& v = at<std::optional<std::string>>(from, f)) {
-                    at<std::optional<std::string>>(into, f) = v;
-                }
+            default:
+                // Scalars, bytes and text: present values are taken, the same in every copy.
+                takePresentValue(f, from, into, fromHas, intoHas);
                 break;
             case FieldKind::Message:
                 if (f.sub->get(slot(from, f)) != nullptr)
@@ -608,21 +606,9 @@ void deepCopy(const MessageDescriptor& d, const void* from, void* into) {
     std::uint64_t& intoHas = hasBits(d, into);
     for (const FieldDescriptor& f : d.fields) {
         switch (f.kind) {
-            case FieldKind::UInt64:
-            case FieldKind::UInt32:
-            case FieldKind::SInt32:
-            case FieldKind::Enum:
-            case FieldKind::Bool:
-                if (isSet(fromHas, f)) {
-                    copyScalar(from, into, f);
-                    intoHas |= std::uint64_t{1} << f.bit;
-                }
-                break;
-            case FieldKind::Data:
-                at<std::optional<Bytes>>(into, f) = at<std::optional<Bytes>>(from, f);
-                break;
-            case FieldKind::String:
-                at<std::optional<std::string>>(into, f) = at<std::optional<std::string>>(from, f);
+            default:
+                // Scalars, bytes and text: present values are taken, the same in every copy.
+                takePresentValue(f, from, into, fromHas, intoHas);
                 break;
             case FieldKind::Message:
                 if (const void* nested = f.sub->get(slot(from, f))) {
