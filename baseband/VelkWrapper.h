@@ -16,7 +16,7 @@
 namespace pyx {
 
 class VelkWrapper : public std::enable_shared_from_this<VelkWrapper> {
-public:
+  public:
     // The shared instance, created on first call (on the main thread, during start-up).
     static std::shared_ptr<VelkWrapper> sharedInstance();
 
@@ -41,7 +41,7 @@ public:
     [[nodiscard]] std::shared_ptr<VelkWrapperDelegate> delegate() const;
     void setDelegate(std::weak_ptr<VelkWrapperDelegate> delegate);
 
-private:
+  private:
     explicit VelkWrapper(MainQueue& mainQueue);
     struct Impl;
     std::unique_ptr<Impl> impl_;

@@ -6,7 +6,7 @@
 namespace pyx {
 
 class VelkWrapperDelegate {
-public:
+  public:
     virtual ~VelkWrapperDelegate() = default;
     virtual void metricsDidUpdate(const MetricRecord& record) = 0;
     virtual void eventsDidUpdate(const MetricRecord& record) = 0;

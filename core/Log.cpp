@@ -60,7 +60,9 @@ CapturedLines::CapturedLines(LineSink& sink) : sink_(sink), state_(std::make_sha
     });
 }
 
-CapturedLines::~CapturedLines() { sink_.intercept({}); }
+CapturedLines::~CapturedLines() {
+    sink_.intercept({});
+}
 
 std::vector<std::string> CapturedLines::lines() const {
     const std::lock_guard lock(state_->mutex);

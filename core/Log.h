@@ -10,15 +10,15 @@
 
 #include <cstdio>
 #include <functional>
-#include <string>
 #include <memory>
+#include <string>
 #include <string_view>
 #include <vector>
 
 namespace pyx {
 
 class LineSink {
-public:
+  public:
     using Writer = std::function<void(std::string_view line)>;
 
     explicit LineSink(std::FILE* file) : file_(file) {}
@@ -33,7 +33,7 @@ public:
     // an empty writer restores the file.
     void intercept(Writer writer);
 
-private:
+  private:
     std::FILE* file_;
     Writer writer_;
 };
@@ -42,12 +42,16 @@ private:
 LineSink& systemLogSink();
 LineSink& standardOutputSink();
 
-inline void systemLog(std::string_view line) { systemLogSink().write(line); }
-inline void standardOutput(std::string_view line) { standardOutputSink().write(line); }
+inline void systemLog(std::string_view line) {
+    systemLogSink().write(line);
+}
+inline void standardOutput(std::string_view line) {
+    standardOutputSink().write(line);
+}
 
 // Collects what a sink writes for the lifetime of the object (tests, tools).
 class CapturedLines {
-public:
+  public:
     explicit CapturedLines(LineSink& sink);
     ~CapturedLines();
     CapturedLines(const CapturedLines&) = delete;
@@ -57,7 +61,7 @@ public:
     [[nodiscard]] bool contains(std::string_view line) const;
     void clear();
 
-private:
+  private:
     LineSink& sink_;
     struct State;
     std::shared_ptr<State> state_;

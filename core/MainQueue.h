@@ -14,7 +14,7 @@
 namespace pyx {
 
 class MainQueue {
-public:
+  public:
     using Task = std::function<void()>;
 
     MainQueue() = default;
@@ -44,7 +44,7 @@ public:
     [[nodiscard]] bool isCurrent() const;
     [[nodiscard]] std::size_t pending() const;
 
-private:
+  private:
     void runTask(Task& task);
 
     mutable std::mutex mutex_;

@@ -12,7 +12,7 @@
 namespace pyx {
 
 class SerialQueue {
-public:
+  public:
     using Task = std::function<void()>;
 
     explicit SerialQueue(std::string label);
@@ -29,7 +29,7 @@ public:
     // Blocks until every task posted before this call has run. Not from the queue's own thread.
     void waitIdle();
 
-private:
+  private:
     void loop();
 
     const std::string label_;

@@ -46,12 +46,16 @@ bool Dict::erase(std::string_view key) {
     return false;
 }
 
-bool operator==(const Dict& a, const Dict& b) { return a.entries_ == b.entries_; }
+bool operator==(const Dict& a, const Dict& b) {
+    return a.entries_ == b.entries_;
+}
 
 std::optional<std::int64_t> Value::toInt64() const {
     switch (kind()) {
-        case Kind::Bool: return asBool() ? 1 : 0;
-        case Kind::Int: return asInt();
+        case Kind::Bool:
+            return asBool() ? 1 : 0;
+        case Kind::Int:
+            return asInt();
         case Kind::UInt:
             if (asUInt() > static_cast<std::uint64_t>(std::numeric_limits<std::int64_t>::max()))
                 return std::nullopt;
@@ -63,17 +67,23 @@ std::optional<std::int64_t> Value::toInt64() const {
                 return std::nullopt;
             return static_cast<std::int64_t>(f);
         }
-        default: return std::nullopt;
+        default:
+            return std::nullopt;
     }
 }
 
 std::optional<float> Value::toFloat() const {
     switch (kind()) {
-        case Kind::Bool: return asBool() ? 1.0F : 0.0F;
-        case Kind::Int: return static_cast<float>(asInt());
-        case Kind::UInt: return static_cast<float>(asUInt());
-        case Kind::Float: return asFloat();
-        default: return std::nullopt;
+        case Kind::Bool:
+            return asBool() ? 1.0F : 0.0F;
+        case Kind::Int:
+            return static_cast<float>(asInt());
+        case Kind::UInt:
+            return static_cast<float>(asUInt());
+        case Kind::Float:
+            return asFloat();
+        default:
+            return std::nullopt;
     }
 }
 
@@ -138,13 +148,27 @@ std::string describeBytes(const Bytes& bytes) {
 
 void Value::appendDescription(std::string& out) const {
     switch (kind()) {
-        case Kind::Null: out += "(null)"; break;
-        case Kind::Bool: out += asBool() ? '1' : '0'; break;
-        case Kind::Int: appendInteger(out, asInt()); break;
-        case Kind::UInt: appendInteger(out, asUInt()); break;
-        case Kind::Float: appendFloat(out, asFloat()); break;
-        case Kind::String: out += asString(); break;
-        case Kind::Data: appendBytes(out, asBytes()); break;
+        case Kind::Null:
+            out += "(null)";
+            break;
+        case Kind::Bool:
+            out += asBool() ? '1' : '0';
+            break;
+        case Kind::Int:
+            appendInteger(out, asInt());
+            break;
+        case Kind::UInt:
+            appendInteger(out, asUInt());
+            break;
+        case Kind::Float:
+            appendFloat(out, asFloat());
+            break;
+        case Kind::String:
+            out += asString();
+            break;
+        case Kind::Data:
+            appendBytes(out, asBytes());
+            break;
         case Kind::List: {
             out += '[';
             bool first = true;

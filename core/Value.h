@@ -26,7 +26,7 @@ struct DictEntry;
 // A dictionary with string keys, in insertion order. Lookups are linear: the system's
 // dictionaries hold a few dozen entries at most, where a scan beats hashing.
 class Dict {
-public:
+  public:
     using Entries = std::vector<DictEntry>;
     using const_iterator = Entries::const_iterator;
     using iterator = Entries::iterator;
@@ -67,12 +67,12 @@ public:
 
     friend bool operator==(const Dict& a, const Dict& b);
 
-private:
+  private:
     Entries entries_;
 };
 
 class Value {
-public:
+  public:
     enum class Kind { Null, Bool, Int, UInt, Float, String, Data, List, Map };
 
     Value() = default;
@@ -127,9 +127,9 @@ public:
 
     friend bool operator==(const Value& a, const Value& b) { return a.v_ == b.v_; }
 
-private:
-    std::variant<std::monostate, bool, std::int64_t, std::uint64_t, float, std::string,
-                 pyx::Bytes, pyx::Array, pyx::Dict>
+  private:
+    std::variant<std::monostate, bool, std::int64_t, std::uint64_t, float, std::string, pyx::Bytes,
+                 pyx::Array, pyx::Dict>
         v_;
 };
 
@@ -145,14 +145,30 @@ inline Dict::Dict(const Dict& other) = default;
 inline Dict::Dict(Dict&& other) noexcept = default;
 inline Dict& Dict::operator=(const Dict& other) = default;
 inline Dict& Dict::operator=(Dict&& other) noexcept = default;
-inline std::size_t Dict::size() const { return entries_.size(); }
-inline bool Dict::empty() const { return entries_.empty(); }
-inline Dict::const_iterator Dict::begin() const { return entries_.begin(); }
-inline Dict::const_iterator Dict::end() const { return entries_.end(); }
-inline Dict::iterator Dict::begin() { return entries_.begin(); }
-inline Dict::iterator Dict::end() { return entries_.end(); }
-inline const DictEntry& Dict::at(std::size_t index) const { return entries_.at(index); }
-inline void Dict::reserve(std::size_t n) { entries_.reserve(n); }
+inline std::size_t Dict::size() const {
+    return entries_.size();
+}
+inline bool Dict::empty() const {
+    return entries_.empty();
+}
+inline Dict::const_iterator Dict::begin() const {
+    return entries_.begin();
+}
+inline Dict::const_iterator Dict::end() const {
+    return entries_.end();
+}
+inline Dict::iterator Dict::begin() {
+    return entries_.begin();
+}
+inline Dict::iterator Dict::end() {
+    return entries_.end();
+}
+inline const DictEntry& Dict::at(std::size_t index) const {
+    return entries_.at(index);
+}
+inline void Dict::reserve(std::size_t n) {
+    entries_.reserve(n);
+}
 inline Value& Dict::emplace(std::string_view key, Value&& value) {
     DictEntry& entry = entries_.emplace_back();
     entry.key.assign(key.data(), key.size());

@@ -8,10 +8,14 @@ namespace pyx {
 nlohmann::ordered_json toJson(const Value& value) {
     using Kind = Value::Kind;
     switch (value.kind()) {
-        case Kind::Null: return nullptr;
-        case Kind::Bool: return value.asBool();
-        case Kind::Int: return value.asInt();
-        case Kind::UInt: return value.asUInt();
+        case Kind::Null:
+            return nullptr;
+        case Kind::Bool:
+            return value.asBool();
+        case Kind::Int:
+            return value.asInt();
+        case Kind::UInt:
+            return value.asUInt();
         case Kind::Float: {
             // Widen through the float's shortest text so that 1.4f prints as 1.4, not as
             // the double nearest to the float (1.399999976158142).
@@ -19,8 +23,10 @@ nlohmann::ordered_json toJson(const Value& value) {
             if (!std::isfinite(f)) return nullptr;
             return std::strtod(formatFloat(f).c_str(), nullptr);
         }
-        case Kind::String: return value.asString();
-        case Kind::Data: return hexString(value.asBytes());
+        case Kind::String:
+            return value.asString();
+        case Kind::Data:
+            return hexString(value.asBytes());
         case Kind::List: {
             auto out = nlohmann::ordered_json::array();
             for (const auto& v : value.asArray()) out.push_back(toJson(v));

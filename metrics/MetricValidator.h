@@ -22,19 +22,19 @@ namespace pyx {
 // A record the intake cannot take: no metric ID, an undecodable payload, no numeric
 // timestamp, an overflowing conversion. The store is left exactly as it was.
 class MetricRejected : public std::runtime_error {
-public:
+  public:
     MetricRejected(std::optional<std::int64_t> metricID, std::string reason);
     [[nodiscard]] const std::optional<std::int64_t>& metricID() const { return metricID_; }
     [[nodiscard]] const std::string& reason() const { return reason_; }
 
-private:
+  private:
     std::optional<std::int64_t> metricID_;
     std::string reason_;
 };
 
 class MetricValidator : public VelkWrapperDelegate,
                         public std::enable_shared_from_this<MetricValidator> {
-public:
+  public:
     // The shared instance: created once (guarded), with VelkWrapper's shared instance as its
     // client. Creation starts the client's listening and then makes the validator its delegate.
     static std::shared_ptr<MetricValidator> sharedInstance();
@@ -99,37 +99,37 @@ public:
 
     // The 31 dictionary properties, each with a getter and a setter (absent until its kind
     // first arrives), declared through one list.
-#define PYX_METRIC_DICTIONARIES(X)                                                             \
-    X(myLTERRCStateDict, setMyLTERRCStateDict)                                                 \
-    X(myLTECDRXConfigDict, setMyLTECDRXConfigDict)                                             \
-    X(myLTESCellInfoDict, setMyLTESCellInfoDict)                                               \
-    X(myLTESCellMeasDict, setMyLTESCellMeasDict)                                               \
-    X(myLTESelReselDict, setMyLTESelReselDict)                                                 \
-    X(myLTERsrpRsrqSinrDict, setMyLTERsrpRsrqSinrDict)                                         \
-    X(myLTECompCarrDict, setMyLTECompCarrDict)                                                 \
-    X(myLTETxPowerDict, setMyLTETxPowerDict)                                                   \
-    X(myLTEInterRatMeasDict, setMyLTEInterRatMeasDict)                                         \
-    X(myLTEIntraRatMeasDict, setMyLTEIntraRatMeasDict)                                         \
-    X(myLTECAStatusDict, setMyLTECAStatusDict)                                                 \
-    X(myLTESecondaryCellMeasDict, setMyLTESecondaryCellMeasDict)                               \
-    X(myLTEEMMContextDict, setMyLTEEMMContextDict)                                             \
-    X(myCellularMMCommonInfoDict, setMyCellularMMCommonInfoDict)                               \
-    X(myCellularActiveBearerDict, setMyCellularActiveBearerDict)                               \
-    X(myGMMContextDict, setMyGMMContextDict)                                                   \
-    X(myMMContextDict, setMyMMContextDict)                                                     \
-    X(myUMTSRRCStateDict, setMyUMTSRRCStateDict)                                               \
-    X(myUMTSRRCConfigDict, setMyUMTSRRCConfigDict)                                             \
-    X(myUMTSCellInfoDict, setMyUMTSCellInfoDict)                                               \
-    X(myUMTSCellMeasDict, setMyUMTSCellMeasDict)                                               \
-    X(myUMTSTxPowerDict, setMyUMTSTxPowerDict)                                                 \
-    X(myUMTSSelReselDict, setMyUMTSSelReselDict)                                               \
-    X(myUMTSNbrMeasDict, setMyUMTSNbrMeasDict)                                                 \
-    X(myGSMScellInfoDict, setMyGSMScellInfoDict)                                               \
-    X(myGSMIdleConfigInfoDict, setMyGSMIdleConfigInfoDict)                                     \
-    X(myGSMIdleScellMeasDict, setMyGSMIdleScellMeasDict)                                       \
-    X(myGSMConnRfMeasDict, setMyGSMConnRfMeasDict)                                             \
-    X(myGSMNbrMeasDict, setMyGSMNbrMeasDict)                                                   \
-    X(myGSMGPRSConfigDict, setMyGSMGPRSConfigDict)                                             \
+#define PYX_METRIC_DICTIONARIES(X)                               \
+    X(myLTERRCStateDict, setMyLTERRCStateDict)                   \
+    X(myLTECDRXConfigDict, setMyLTECDRXConfigDict)               \
+    X(myLTESCellInfoDict, setMyLTESCellInfoDict)                 \
+    X(myLTESCellMeasDict, setMyLTESCellMeasDict)                 \
+    X(myLTESelReselDict, setMyLTESelReselDict)                   \
+    X(myLTERsrpRsrqSinrDict, setMyLTERsrpRsrqSinrDict)           \
+    X(myLTECompCarrDict, setMyLTECompCarrDict)                   \
+    X(myLTETxPowerDict, setMyLTETxPowerDict)                     \
+    X(myLTEInterRatMeasDict, setMyLTEInterRatMeasDict)           \
+    X(myLTEIntraRatMeasDict, setMyLTEIntraRatMeasDict)           \
+    X(myLTECAStatusDict, setMyLTECAStatusDict)                   \
+    X(myLTESecondaryCellMeasDict, setMyLTESecondaryCellMeasDict) \
+    X(myLTEEMMContextDict, setMyLTEEMMContextDict)               \
+    X(myCellularMMCommonInfoDict, setMyCellularMMCommonInfoDict) \
+    X(myCellularActiveBearerDict, setMyCellularActiveBearerDict) \
+    X(myGMMContextDict, setMyGMMContextDict)                     \
+    X(myMMContextDict, setMyMMContextDict)                       \
+    X(myUMTSRRCStateDict, setMyUMTSRRCStateDict)                 \
+    X(myUMTSRRCConfigDict, setMyUMTSRRCConfigDict)               \
+    X(myUMTSCellInfoDict, setMyUMTSCellInfoDict)                 \
+    X(myUMTSCellMeasDict, setMyUMTSCellMeasDict)                 \
+    X(myUMTSTxPowerDict, setMyUMTSTxPowerDict)                   \
+    X(myUMTSSelReselDict, setMyUMTSSelReselDict)                 \
+    X(myUMTSNbrMeasDict, setMyUMTSNbrMeasDict)                   \
+    X(myGSMScellInfoDict, setMyGSMScellInfoDict)                 \
+    X(myGSMIdleConfigInfoDict, setMyGSMIdleConfigInfoDict)       \
+    X(myGSMIdleScellMeasDict, setMyGSMIdleScellMeasDict)         \
+    X(myGSMConnRfMeasDict, setMyGSMConnRfMeasDict)               \
+    X(myGSMNbrMeasDict, setMyGSMNbrMeasDict)                     \
+    X(myGSMGPRSConfigDict, setMyGSMGPRSConfigDict)               \
     X(mySIMFileInfoDict, setMySIMFileInfoDict)
 
     enum class DictionaryProperty {
@@ -139,12 +139,12 @@ public:
     };
     static constexpr std::size_t kDictionaryPropertyCount = 31;
 
-#define PYX_ACCESSORS(name, setter)                                                            \
-    [[nodiscard]] const std::optional<DisplayDictionary>& name() const {                       \
-        return dictionary(DictionaryProperty::name);                                           \
-    }                                                                                          \
-    void setter(std::optional<DisplayDictionary> value) {                                      \
-        setDictionary(DictionaryProperty::name, std::move(value));                             \
+#define PYX_ACCESSORS(name, setter)                                      \
+    [[nodiscard]] const std::optional<DisplayDictionary>& name() const { \
+        return dictionary(DictionaryProperty::name);                     \
+    }                                                                    \
+    void setter(std::optional<DisplayDictionary> value) {                \
+        setDictionary(DictionaryProperty::name, std::move(value));       \
     }
     PYX_METRIC_DICTIONARIES(PYX_ACCESSORS)
 #undef PYX_ACCESSORS
@@ -157,7 +157,9 @@ public:
     [[nodiscard]] static std::string_view nameOf(DictionaryProperty p);
 
     // LTE bandwidth code to MHz.
-    [[nodiscard]] const std::map<std::int32_t, float>& dlbwlookup() const { return dlbwlookup_; }
+    [[nodiscard]] const std::map<std::int32_t, float>& dlbwlookup() const {
+        return dlbwlookup_;
+    }
 
     // VelkWrapperDelegate. metricsDidUpdate lets a MetricRejected through to the caller.
     void metricsDidUpdate(const MetricRecord& record) override;
@@ -168,10 +170,10 @@ public:
     // after which nothing has changed.
     virtual bool isMetricIDValidWithMetricdict(const MetricRecord& record);
 
-protected:
+  protected:
     explicit MetricValidator(std::shared_ptr<VelkWrapper> client);
 
-private:
+  private:
     struct Impl;
     std::shared_ptr<VelkWrapper> mySharedVelkInstance_;
     std::optional<std::int64_t> metricID_;

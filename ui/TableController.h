@@ -16,7 +16,7 @@ struct Cell {
 };
 
 class TableController {
-public:
+  public:
     virtual ~TableController() = default;
     [[nodiscard]] virtual int numberOfSections() const = 0;
     [[nodiscard]] virtual std::optional<std::string> titleForHeaderInSection(int section) const = 0;

@@ -79,9 +79,9 @@ TEST(ValueDict, EmplaceAppendsAnEntryBuiltInPlace) {
     Value& stored = d.emplace(longKey, Value(Array{Value(2), Value(3)}));
     EXPECT_EQ(stored, Value(Array{Value(2), Value(3)}));
     d.emplace("b", Value("text"));
-    EXPECT_EQ(d, (Dict{{"a", Value(1)},
-                       {longKey, Value(Array{Value(2), Value(3)})},
-                       {"b", Value("text")}}));
+    EXPECT_EQ(
+        d,
+        (Dict{{"a", Value(1)}, {longKey, Value(Array{Value(2), Value(3)})}, {"b", Value("text")}}));
 }
 
 TEST(ValueDict, EqualityIsOrderSensitive) {
