@@ -12,6 +12,7 @@
 #include <thread>
 
 #include "app/AppDelegate.h"
+#include "app/RejectedRecords.h"
 #include "app/RootNavigationController.h"
 #include "baseband/VelkWrapper.h"
 #include "baseband/velk/Client.h"
@@ -35,7 +36,7 @@ struct Options {
 };
 
 // SIGINT and SIGTERM are blocked in every thread (set before any thread starts) and taken by
-// one waiting thread, which stops the main queue; the queue then runs what is still queued.
+// one waiting thread, which stops the main queue; the queue then runs what was queued by then.
 class StopOnSignal {
   public:
     StopOnSignal() {
@@ -62,23 +63,6 @@ class StopOnSignal {
     std::atomic<bool> done_{false};
     std::thread waiter_;
 };
-
-// A record the store refuses is reported in one line and counted; the program goes on.
-void reportRejectedRecords(std::uint64_t& rejected) {
-    MainQueue::shared().setErrorHandler([&rejected](std::exception_ptr error) {
-        try {
-            std::rethrow_exception(error);
-        } catch (const MetricRejected& rejection) {
-            ++rejected;
-            const std::string id =
-                rejection.metricID()
-                    ? format("0x%llX", static_cast<unsigned long long>(*rejection.metricID()))
-                    : std::string("(none)");
-            systemLog(format("pyxon: rejected metric record %s: %s", id.c_str(),
-                             rejection.reason().c_str()));
-        }
-    });
-}
 
 int runHeadless(RootNavigationController& root) {
     MainQueue& mainQueue = MainQueue::shared();
@@ -136,8 +120,7 @@ int runPyxon(int argc, char** argv) {
     std::optional<StopOnSignal> stopOnSignal;
     if (!window) stopOnSignal.emplace();
 
-    std::uint64_t rejected = 0;
-    reportRejectedRecords(rejected);
+    const RejectedRecords rejected(MainQueue::shared());
 
     velk::client::SetTransportFactory([seed = options.seed, speed = options.speed] {
         return std::make_shared<sim::SimulatedBaseband>(
