@@ -141,6 +141,16 @@ std::uint64_t hashBytes(const void* data, std::size_t size) {
 
 constexpr std::uint64_t kHashMultiplier = 2654435761ULL;
 
+// A non-empty repeated scalar list as one packed record: key, length, then the bare values.
+template <class List, class WriteValue>
+void writePacked(PBDataWriter& writer, const List& list, std::uint32_t tag, WriteValue write) {
+    if (list.empty()) return;
+    PBDataWriterMark mark;
+    PBDataWriterPlaceMark(writer, mark, tag);
+    for (const auto v : list) write(writer, v, kNoTag);
+    PBDataWriterRecallMark(writer, mark, tag);
+}
+
 // Takes a present scalar (value and presence bit), bytes or text of field f from `from` into
 // `into`; what copying and merging share. Other kinds are left to the caller.
 void takePresentValue(const FieldDescriptor& f, const void* from, void* into, std::uint64_t fromHas,
@@ -322,24 +332,14 @@ void writeMessage(const MessageDescriptor& d, const void* message, PBDataWriter&
                 }
                 break;
             }
-            case FieldKind::UInt32List: {
-                const auto& list = at<PBRepeatedUInt32>(message, f);
-                if (list.empty()) break;
-                PBDataWriterMark mark;
-                PBDataWriterPlaceMark(writer, mark, f.tag);
-                for (const std::uint32_t v : list) PBDataWriterWriteUint32Field(writer, v, kNoTag);
-                PBDataWriterRecallMark(writer, mark, f.tag);
+            case FieldKind::UInt32List:
+                writePacked(writer, at<PBRepeatedUInt32>(message, f), f.tag,
+                            PBDataWriterWriteUint32Field);
                 break;
-            }
-            case FieldKind::SInt32List: {
-                const auto& list = at<PBRepeatedInt32>(message, f);
-                if (list.empty()) break;
-                PBDataWriterMark mark;
-                PBDataWriterPlaceMark(writer, mark, f.tag);
-                for (const std::int32_t v : list) PBDataWriterWriteSint32Field(writer, v, kNoTag);
-                PBDataWriterRecallMark(writer, mark, f.tag);
+            case FieldKind::SInt32List:
+                writePacked(writer, at<PBRepeatedInt32>(message, f), f.tag,
+                            PBDataWriterWriteSint32Field);
                 break;
-            }
         }
     }
 }
