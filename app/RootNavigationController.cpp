@@ -6,8 +6,9 @@
 
 namespace pyx {
 
-// The client's shared instance is taken before the store's, whose creation starts listening
-// and makes the store the client's delegate.
+// Whichever of the two shared instances is evaluated first, the client exists before the store:
+// the store's creation takes the client's shared instance, starts listening and only then
+// becomes the client's delegate.
 RootNavigationController::RootNavigationController()
     : RootNavigationController(VelkWrapper::sharedInstance(), MetricValidator::sharedInstance(),
                                Bundle::mainBundle()) {}

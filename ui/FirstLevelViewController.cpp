@@ -1,6 +1,5 @@
 #include "ui/FirstLevelViewController.h"
 
-#include <cstddef>
 #include <utility>
 
 #include "ui/ScreenSelectionError.h"
@@ -26,7 +25,7 @@ int FirstLevelViewController::numberOfRowsInSection(int) const {
 }
 
 Cell FirstLevelViewController::cellForRowAtIndexPath(int, int row) const {
-    return Cell{categories().at(static_cast<std::size_t>(row)), std::nullopt};
+    return menuCell(categories(), row);
 }
 
 void FirstLevelViewController::prepareForSegue(TableController& destination,

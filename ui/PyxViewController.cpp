@@ -1,7 +1,5 @@
 #include "ui/PyxViewController.h"
 
-#include <cstddef>
-
 #include "ui/FirstLevelViewController.h"
 #include "ui/PyxViewItems.h"
 
@@ -12,8 +10,7 @@ int PyxViewController::numberOfRowsInSection(int) const {
 }
 
 Cell PyxViewController::cellForRowAtIndexPath(int, int row) const {
-    return Cell{sharedPyxViewItems().launchViewItemNames.at(static_cast<std::size_t>(row)),
-                std::nullopt};
+    return menuCell(sharedPyxViewItems().launchViewItemNames, row);
 }
 
 void PyxViewController::prepareForSegue(TableController& destination, const Cell* sender) const {

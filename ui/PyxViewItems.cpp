@@ -1,5 +1,7 @@
 #include "ui/PyxViewItems.h"
 
+#include <cstddef>
+
 namespace pyx {
 
 PyxViewItems makePyxViewItems() {
@@ -27,6 +29,11 @@ PyxViewItems makePyxViewItems() {
 const PyxViewItems& sharedPyxViewItems() {
     static const PyxViewItems items = makePyxViewItems();
     return items;
+}
+
+Cell menuCell(const std::vector<std::string>& titles, int row) {
+    if (row < 0 || static_cast<std::size_t>(row) >= titles.size()) return Cell{};
+    return Cell{titles[static_cast<std::size_t>(row)], std::nullopt};
 }
 
 }  // namespace pyx

@@ -7,6 +7,8 @@
 #include <string>
 #include <vector>
 
+#include "ui/TableController.h"
+
 namespace pyx {
 
 struct PyxViewItems {
@@ -21,5 +23,9 @@ PyxViewItems makePyxViewItems();
 
 // The value built once per process, read by the launch screen.
 const PyxViewItems& sharedPyxViewItems();
+
+// A menu row: the title at row as the main text. A row past the list is a cell left as
+// dequeued, like any screen asked for an element that is not there.
+Cell menuCell(const std::vector<std::string>& titles, int row);
 
 }  // namespace pyx

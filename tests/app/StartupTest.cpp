@@ -128,7 +128,12 @@ TEST_F(Startup, PushSendsTheConfigurationResourceBytes) {
 TEST(RootNavigation, TakesTheClientsSharedInstanceThenTheStoresThenWaitsForItsView) {
     auto transport = std::make_shared<DelegateProbe>();
     velk::client::SetTransportFactory([transport] { return transport; });
+    // The probe watches the shared client, so that it sees whether the store listened before
+    // it became the delegate.
+    transport->client = VelkWrapper::sharedInstance();
     RootNavigationController root;
+    EXPECT_EQ(transport->delegateAtStart, std::vector<bool>{false})
+        << "the shared store listens once, before it becomes the delegate";
     EXPECT_EQ(root.myVelkWrapper, VelkWrapper::sharedInstance());
     EXPECT_EQ(root.myMetricValidator, MetricValidator::sharedInstance());
     EXPECT_EQ(root.myMetricValidator->mySharedVelkInstance(), root.myVelkWrapper);

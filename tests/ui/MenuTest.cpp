@@ -151,9 +151,11 @@ TEST_F(Menu, FirstLevelWithUnknownGroupRefusesToAnswer) {
     }
 }
 
-TEST_F(Menu, RowPastTheListIsOutOfRange) {
-    EXPECT_THROW((void)launch.cellForRowAtIndexPath(0, 4), std::out_of_range);
-    EXPECT_THROW((void)menuFor("Device Info").cellForRowAtIndexPath(0, 3), std::out_of_range);
+TEST_F(Menu, RowPastTheListIsACellLeftAsDequeued) {
+    EXPECT_EQ(launch.cellForRowAtIndexPath(0, 4), Cell{});
+    EXPECT_EQ(launch.cellForRowAtIndexPath(0, -1), Cell{});
+    EXPECT_EQ(menuFor("Device Info").cellForRowAtIndexPath(0, 3), Cell{});
+    EXPECT_EQ(menuFor("Device Info").cellForRowAtIndexPath(0, 2).text, "SIM Files");
 }
 
 TEST_F(Menu, EveryScreenKeepsItsOwnCopyOfTheMenuItems) {

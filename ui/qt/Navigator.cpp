@@ -80,11 +80,9 @@ bool Navigator::select(int index) {
             const auto& from = static_cast<SecondLevelViewController&>(top->controller());
             const std::optional<Cell> tapped = top->model()->cellAt(index);
             auto details = std::make_shared<ThirdLevelViewController>();
+            // The category screen hands nothing on: the placeholder's selections stay unset.
+            // Only the title bar names the entry that was tapped.
             from.prepareForSegue(*details, &*tapped);
-            // The category screen hands nothing on; the navigation records where it came from.
-            details->setFirstSelection(from.firstSelection());
-            details->setSeguedThroughRow(from.seguedThroughRow());
-            details->setSecondSelection(tapped->text);
             QString title = fromText(tapped->text);
             if (title.isEmpty()) title = top->title();
             push(new Screen(Screen::ThirdLevel, title, std::move(details), this));

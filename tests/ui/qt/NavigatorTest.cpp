@@ -98,7 +98,10 @@ TEST_F(NavigatorTest, TappingACategoryRowOpensTheThirdLevelPlaceholder) {
     EXPECT_FALSE(
         details->model()->data(details->model()->index(0), TableModel::TextRole).isValid());
     const auto& controller = dynamic_cast<ThirdLevelViewController&>(details->controller());
-    EXPECT_EQ(controller.secondSelection(), "rrc_state");
+    // The category screen passes nothing on to the placeholder.
+    EXPECT_FALSE(controller.firstSelection().has_value());
+    EXPECT_FALSE(controller.seguedThroughRow().has_value());
+    EXPECT_FALSE(controller.secondSelection().has_value());
     EXPECT_FALSE(navigator.select(0));
     EXPECT_EQ(navigator.depth(), 4);
 }
