@@ -180,20 +180,23 @@ void Value::appendDescription(std::string& out) const {
             out += ']';
             break;
         }
-        case Kind::Map: {
-            out += '{';
-            bool first = true;
-            for (const auto& [k, v] : asDict()) {
-                if (!first) out += ", ";
-                first = false;
-                out += k;
-                out += ": ";
-                v.appendDescription(out);
-            }
-            out += '}';
+        case Kind::Map:
+            pyx::appendDescription(out, asDict());
             break;
-        }
     }
+}
+
+void appendDescription(std::string& out, const Dict& dict) {
+    out += '{';
+    bool first = true;
+    for (const auto& [key, value] : dict) {
+        if (!first) out += ", ";
+        first = false;
+        out += key;
+        out += ": ";
+        value.appendDescription(out);
+    }
+    out += '}';
 }
 
 std::string Value::description() const {

@@ -181,6 +181,9 @@ inline Value& Dict::emplace(std::string_view key, Value&& value) {
 std::string formatFloat(float value);
 // Lowercase hex in angle brackets with a blank after every four bytes: "<0a0b0c0d 0e0f>".
 std::string describeBytes(const Bytes& bytes);
+// Appends a dictionary's description, "{key: value, ...}" in its own order, as a Value
+// holding it describes itself.
+void appendDescription(std::string& out, const Dict& dict);
 // Plain lowercase hex digits, no separators: "0a0b".
 std::string hexString(const Bytes& bytes);
 

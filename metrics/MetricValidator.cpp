@@ -56,20 +56,6 @@ class HexLine {
     std::size_t size_ = 0;
 };
 
-// The arrival line: the kind's prefix, then the stored dictionary's description.
-void appendDictionaryDescription(std::string& out, const Dict& dict) {
-    out += '{';
-    bool first = true;
-    for (const auto& [key, value] : dict) {
-        if (!first) out += ", ";
-        first = false;
-        out += key;
-        out += ": ";
-        value.appendDescription(out);
-    }
-    out += '}';
-}
-
 }  // namespace
 
 MetricRejected::MetricRejected(std::optional<std::int64_t> metricID, std::string reason)
@@ -161,10 +147,9 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     update.commit();
 
     const auto& now = self.dictionary(property);
-    std::string line;
-    line.reserve(kind->logPrefix.size() + 256);
-    line += kind->logPrefix;
-    if (now) appendDictionaryDescription(line, *now);
+    std::string& line = self.arrivalLine_;
+    line.assign(kind->logPrefix);
+    if (now) appendDescription(line, *now);
     standardOutput(line);
     return true;
 }

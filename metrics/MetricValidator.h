@@ -183,6 +183,8 @@ class MetricValidator : public VelkWrapperDelegate,
     CommonListHolder myCommon_;
     std::optional<DisplayDictionary> dictionaries_[kDictionaryPropertyCount];
     std::map<std::int32_t, float> dlbwlookup_;
+    // The arrival line of the record being taken; kept so that its capacity is reused.
+    std::string arrivalLine_;
 };
 
 }  // namespace pyx
