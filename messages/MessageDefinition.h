@@ -64,7 +64,8 @@
         static constexpr auto kTagIndex =                                                   \
             ::pyx::detail::buildTagIndex<::pyx::detail::maxTag(kFields) + 1>(kFields);      \
         static constexpr ::pyx::MessageDescriptor kDescriptor{                              \
-            #Class, kFields, kTagIndex, static_cast<std::uint32_t>(offsetof(Self, has_))};  \
+            #Class, kFields, kTagIndex, static_cast<std::uint32_t>(offsetof(Self, has_)),   \
+            ::pyx::detail::unflaggedFields(kFields)};                                       \
         return kDescriptor;                                                                 \
     }                                                                                       \
     _Pragma("GCC diagnostic pop")

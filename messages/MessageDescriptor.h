@@ -66,6 +66,9 @@ struct MessageDescriptor {
     std::span<const FieldDescriptor> fields;
     std::span<const std::uint8_t> tagIndex;  // field number -> entry, kNoField when none
     std::uint32_t hasOffset;                 // where the presence bit-set is
+    // Fields whose presence no bit tells (bytes, text, a nested message, a scalar list): with
+    // the bits that are set, an upper bound on the entries of the dictionary form.
+    std::uint32_t unflaggedFields;
 
     static constexpr std::uint8_t kNoField = 0xFF;
 
@@ -92,6 +95,13 @@ constexpr std::array<std::uint8_t, Size> buildTagIndex(const FieldDescriptor (&f
     for (auto& slot : index) slot = MessageDescriptor::kNoField;
     for (std::size_t i = 0; i < N; ++i) index[fields[i].tag] = static_cast<std::uint8_t>(i);
     return index;
+}
+
+template <std::size_t N>
+constexpr std::uint32_t unflaggedFields(const FieldDescriptor (&fields)[N]) {
+    std::uint32_t n = 0;
+    for (const auto& f : fields) n += (f.isScalar() || f.kind == FieldKind::MessageList) ? 0 : 1;
+    return n;
 }
 
 template <std::size_t N>

@@ -1,5 +1,7 @@
 #include "messages/MessageRuntime.h"
 
+#include <algorithm>
+#include <bit>
 #include <optional>
 #include <string>
 #include <vector>
@@ -347,7 +349,10 @@ void writeMessage(const MessageDescriptor& d, const void* message, PBDataWriter&
 Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
     const std::uint64_t has = hasBits(d, message);
     Dict dict;
-    dict.reserve(d.fields.size());
+    // Room for what can be present, not for every field: a dictionary of a few entries stays
+    // a small allocation.
+    dict.reserve(std::min<std::size_t>(
+        d.fields.size(), static_cast<std::size_t>(std::popcount(has)) + d.unflaggedFields));
     for (const FieldDescriptor& f : d.fields) {
         switch (f.kind) {
             case FieldKind::UInt64:
