@@ -11,9 +11,9 @@ namespace pyx {
 // "GMT+5:30".
 [[nodiscard]] std::string gmtOffsetText(long offsetSeconds);
 
-// The text of the instant milliseconds after the epoch, in the local time zone (converted
-// afresh on each call; fractions of a second are dropped). Nothing when the instant cannot be
-// represented (not finite, or beyond the calendar's range).
+// The text of the instant milliseconds after the epoch, in the process's local time zone (as
+// the C library took it from TZ or the system's zone file; fractions of a second are dropped).
+// Nothing when the instant cannot be represented (not finite, or beyond the calendar's range).
 [[nodiscard]] std::optional<std::string> timestampText(double milliseconds);
 
 }  // namespace pyx
