@@ -79,6 +79,7 @@ bool Navigator::select(int index) {
         case Screen::SecondLevel: {
             const auto& from = static_cast<SecondLevelViewController&>(top->controller());
             const std::optional<Cell> tapped = top->model()->cellAt(index);
+            if (!tapped) return false;
             auto details = std::make_shared<ThirdLevelViewController>();
             // The category screen hands nothing on: the placeholder's selections stay unset.
             // Only the title bar names the entry that was tapped.
