@@ -20,7 +20,7 @@
 #include "core/Log.h"
 #include "core/MainQueue.h"
 #include "metrics/MetricValidator.h"
-#include "sim/SimulatedBaseband.h"
+#include "sources/Source.h"
 #ifdef PYXON_HAVE_WINDOW
 #include "ui/qt/QtFrontEnd.h"
 #endif
@@ -30,6 +30,7 @@ namespace {
 
 struct Options {
     bool headless = false;
+    std::string source = "sim";
     std::uint64_t seed = 1;
     double speed = 1.0;
     std::optional<std::string> screenshots;
@@ -77,12 +78,16 @@ int runHeadless(RootNavigationController& root) {
 int runPyxon(int argc, char** argv) {
     CLI::App cli{
         "Pyxon shows what the baseband reports: serving cell, neighbours, RRC state, transmit\n"
-        "power, carrier aggregation, NAS contexts, bearers and SIM files. It runs on the\n"
-        "built-in simulated baseband.",
+        "power, carrier aggregation, NAS contexts, bearers and SIM files, from the built-in\n"
+        "simulated baseband or a real modem through ModemManager.",
         "pyxon"};
     Options options;
     cli.add_flag("--headless", options.headless,
                  "No window: print the system's lines as events arrive, until SIGINT or SIGTERM");
+    cli.add_option("--source", options.source,
+                   "Where events come from: sim, modem, modem:N or replay:FILE (see below)")
+        ->type_name("SPEC")
+        ->capture_default_str();
     cli.add_option("--seed", options.seed, "Seed of the simulated baseband's drive")
         ->capture_default_str();
     cli.add_option("--speed", options.speed,
@@ -93,7 +98,10 @@ int runPyxon(int argc, char** argv) {
                    "Render every screen to PNG files in this folder, then quit")
         ->type_name("DIR");
     cli.set_version_flag("--version", std::string("pyxon ") + PYXON_VERSION);
-    cli.footer("Example: pyxon --headless --speed 20");
+    cli.footer(std::string(sources::sourceHelp()) +
+               "\nExamples:\n"
+               "  pyxon --headless --speed 20\n"
+               "  pyxon --source modem\n");
     try {
         cli.parse(argc, argv);
     } catch (const CLI::CallForHelp& e) {
@@ -102,6 +110,13 @@ int runPyxon(int argc, char** argv) {
         return cli.exit(e);
     } catch (const CLI::ParseError& e) {
         std::cerr << "pyxon: " << e.what() << "\nRun with --help for more information.\n";
+        return 2;
+    }
+    std::optional<sources::SourceSpec> sourceSpec;
+    try {
+        sourceSpec = sources::parseSourceSpec(options.source);
+    } catch (const sources::SourceSpecError& e) {
+        std::cerr << "pyxon: " << e.what() << "\n";
         return 2;
     }
 
@@ -122,10 +137,15 @@ int runPyxon(int argc, char** argv) {
 
     const RejectedRecords rejected(MainQueue::shared());
 
-    velk::client::SetTransportFactory([seed = options.seed, speed = options.speed] {
-        return std::make_shared<sim::SimulatedBaseband>(
-            sim::SimulatedBaseband::Options{seed, speed, std::nullopt});
-    });
+    std::shared_ptr<velk::client::Transport> transport;
+    try {
+        transport = sources::makeTransport(
+            sources::SourceOptions{*sourceSpec, options.seed, options.speed, false});
+    } catch (const sources::SourceSpecError& e) {
+        std::cerr << "pyxon: " << e.what() << "\n";
+        return 2;
+    }
+    velk::client::SetTransportFactory([transport] { return transport; });
 
     AppDelegate appDelegate;
     appDelegate.applicationDidFinishLaunchingWithOptions(Dict{});

@@ -18,8 +18,8 @@
 #include "core/Value.h"
 #include "messages/Messages.h"
 #include "metrics/MetricCatalogue.h"
-#include "sim/Drive.h"
-#include "sim/Random.h"
+#include "sources/sim/Drive.h"
+#include "sources/sim/Random.h"
 
 namespace {
 

@@ -7,8 +7,8 @@
 #include <string>
 
 #include "baseband/velk/Names.h"
-#include "sim/DeviceConfig.h"
-#include "sim/Timeline.h"
+#include "sources/sim/DeviceConfig.h"
+#include "sources/sim/Timeline.h"
 
 namespace pyx::testing {
 

@@ -5,9 +5,9 @@
 #include <string>
 
 #include "messages/Messages.h"
-#include "sim/Identities.h"
-#include "sim/PayloadHelpers.h"
-#include "sim/Payloads.h"
+#include "sources/sim/Identities.h"
+#include "sources/sim/PayloadHelpers.h"
+#include "sources/sim/Payloads.h"
 
 namespace pyx::sim::payloads {
 

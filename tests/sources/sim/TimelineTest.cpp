@@ -1,4 +1,4 @@
-#include "sim/Timeline.h"
+#include "sources/sim/Timeline.h"
 
 #include <gtest/gtest.h>
 
@@ -6,8 +6,8 @@
 #include <set>
 #include <vector>
 
-#include "tests/sim/Decoders.h"
-#include "tests/sim/SimEvents.h"
+#include "tests/sources/sim/Decoders.h"
+#include "tests/sources/sim/SimEvents.h"
 
 namespace {
 

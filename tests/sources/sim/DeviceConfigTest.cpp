@@ -1,4 +1,4 @@
-#include "sim/DeviceConfig.h"
+#include "sources/sim/DeviceConfig.h"
 
 #include <gtest/gtest.h>
 
@@ -7,7 +7,7 @@
 #include <iterator>
 #include <string>
 
-#include "sim/Drive.h"
+#include "sources/sim/Drive.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "sim/SimulatedBaseband.h"
+#include "sources/sim/SimulatedBaseband.h"
 
 #include <chrono>
 #include <cmath>

@@ -1,11 +1,11 @@
-#include "sim/Drive.h"
+#include "sources/sim/Drive.h"
 
 #include <algorithm>
 #include <array>
 #include <string>
 
-#include "sim/Identities.h"
-#include "sim/Payloads.h"
+#include "sources/sim/Identities.h"
+#include "sources/sim/Payloads.h"
 
 namespace pyx::sim {
 

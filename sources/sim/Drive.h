@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "core/Value.h"
-#include "sim/DriveState.h"
-#include "sim/Random.h"
+#include "sources/sim/DriveState.h"
+#include "sources/sim/Random.h"
 
 namespace pyx::sim {
 

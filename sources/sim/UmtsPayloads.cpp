@@ -4,8 +4,8 @@
 #include <utility>
 
 #include "messages/Messages.h"
-#include "sim/PayloadHelpers.h"
-#include "sim/Payloads.h"
+#include "sources/sim/PayloadHelpers.h"
+#include "sources/sim/Payloads.h"
 
 namespace pyx::sim::payloads {
 

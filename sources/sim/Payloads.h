@@ -6,8 +6,8 @@
 #include <cstdint>
 
 #include "core/Value.h"
-#include "sim/DriveState.h"
-#include "sim/Random.h"
+#include "sources/sim/DriveState.h"
+#include "sources/sim/Random.h"
 
 namespace pyx::sim::payloads {
 

@@ -1,4 +1,4 @@
-#include "sim/Identities.h"
+#include "sources/sim/Identities.h"
 
 namespace pyx::sim {
 

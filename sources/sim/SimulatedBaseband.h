@@ -13,7 +13,7 @@
 #include <thread>
 
 #include "baseband/velk/Transport.h"
-#include "sim/Timeline.h"
+#include "sources/sim/Timeline.h"
 
 namespace pyx::sim {
 

@@ -5,8 +5,8 @@
 
 #include "messages/Messages.h"
 #include "messages/PBDataWriter.h"
-#include "sim/PayloadHelpers.h"
-#include "sim/Payloads.h"
+#include "sources/sim/PayloadHelpers.h"
+#include "sources/sim/Payloads.h"
 
 namespace pyx::sim::payloads {
 

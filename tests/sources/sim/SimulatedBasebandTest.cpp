@@ -1,4 +1,4 @@
-#include "sim/SimulatedBaseband.h"
+#include "sources/sim/SimulatedBaseband.h"
 
 #include <gtest/gtest.h>
 
@@ -15,8 +15,8 @@
 
 #include "baseband/VelkWrapper.h"
 #include "tests/baseband/RecordingDelegate.h"
-#include "tests/sim/Decoders.h"
-#include "tests/sim/SimEvents.h"
+#include "tests/sources/sim/Decoders.h"
+#include "tests/sources/sim/SimEvents.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "sim/Random.h"
+#include "sources/sim/Random.h"
 
 #include <algorithm>
 

@@ -1,4 +1,4 @@
-#include "sim/Timeline.h"
+#include "sources/sim/Timeline.h"
 
 #include <utility>
 

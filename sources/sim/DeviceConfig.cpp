@@ -1,4 +1,4 @@
-#include "sim/DeviceConfig.h"
+#include "sources/sim/DeviceConfig.h"
 
 #include <charconv>
 #include <optional>

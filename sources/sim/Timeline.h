@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "core/Value.h"
-#include "sim/DeviceConfig.h"
-#include "sim/Drive.h"
+#include "sources/sim/DeviceConfig.h"
+#include "sources/sim/Drive.h"
 
 namespace pyx::sim {
 

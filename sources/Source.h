@@ -1,0 +1,52 @@
+// Where events come from: the one place that turns a --source text into a velk transport.
+// Nothing above baseband/ knows which source runs; the programs only parse the option and
+// hand the transport factory to velk::client::SetTransportFactory.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <string_view>
+
+#include "baseband/velk/Transport.h"
+
+namespace pyx::sources {
+
+// A --source text that is not one of the forms below; what() says which forms there are.
+class SourceSpecError : public std::invalid_argument {
+  public:
+    using std::invalid_argument::invalid_argument;
+};
+
+struct SourceSpec {
+    enum class Kind { Sim, Modem, Replay };
+    Kind kind = Kind::Sim;
+    // modem:N, the modem whose object path ends in /Modem/N; absent for the first modem.
+    std::optional<std::uint32_t> modemIndex;
+    // replay:FILE, the recording to play.
+    std::string file;
+    // The text as given ("sim", "modem:0", "replay:drive.pyxrec"), for logs and recordings.
+    std::string text = "sim";
+};
+
+// "sim", "modem", "modem:N" or "replay:FILE". Throws SourceSpecError.
+[[nodiscard]] SourceSpec parseSourceSpec(std::string_view text);
+
+struct SourceOptions {
+    SourceSpec spec;
+    std::uint64_t seed = 1;  // sim
+    double speed = 1.0;      // sim: time runs this much faster; replay: 0 = as fast as taken
+    bool loop = false;       // replay: start again at the end
+};
+
+// The transport of a source. Throws SourceSpecError for options that do not fit the source
+// (a speed the simulated baseband refuses, a replay file that cannot be opened...), with one
+// line that names what is wrong.
+[[nodiscard]] std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& options);
+
+// The help text that explains the sources, with an example each; shared by pyxon and pyxonctl.
+[[nodiscard]] std::string_view sourceHelp();
+
+}  // namespace pyx::sources
