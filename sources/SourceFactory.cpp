@@ -2,6 +2,7 @@
 #include <string>
 
 #include "sources/Source.h"
+#include "sources/modem/ModemManagerBaseband.h"
 #include "sources/sim/SimulatedBaseband.h"
 
 namespace pyx::sources {
@@ -51,9 +52,11 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
             } catch (const std::invalid_argument& e) {
                 throw SourceSpecError(e.what());
             }
-        case SourceSpec::Kind::Modem:
-            throw SourceSpecError("--source " + options.spec.text +
-                                  ": this build has no ModemManager source");
+        case SourceSpec::Kind::Modem: {
+            modem::ModemManagerBaseband::Options modem;
+            modem.modemIndex = options.spec.modemIndex;
+            return std::make_shared<modem::ModemManagerBaseband>(modem);
+        }
         case SourceSpec::Kind::Replay:
             throw SourceSpecError("--source " + options.spec.text +
                                   ": this build has no replay source");

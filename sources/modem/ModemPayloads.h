@@ -1,0 +1,32 @@
+// The metric kinds the ModemManager source writes, and their payloads, written with our
+// message classes from what the modem said. A kind the modem has nothing for has no payload.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <span>
+#include <string_view>
+
+#include "core/Value.h"
+#include "sources/modem/ModemReading.h"
+
+namespace pyx::modem {
+
+using PayloadWriter = std::optional<Bytes> (*)(const ModemReading& reading,
+                                               std::uint64_t timestamp);
+
+struct ModemKind {
+    std::int64_t metricID;  // the catalogue's ID
+    std::string_view messageClass;
+    PayloadWriter write;
+};
+
+// Every kind this source writes, one row each.
+[[nodiscard]] std::span<const ModemKind> modemKinds();
+[[nodiscard]] const ModemKind* findModemKind(std::int64_t metricID);
+
+// The SIM files kind, also written (possibly without files) when the SIM is asked for.
+inline constexpr std::int64_t kSimFilesMetricID = 0x3C0013;
+[[nodiscard]] Bytes simFilesPayload(const ModemReading& reading, std::uint64_t timestamp);
+
+}  // namespace pyx::modem
