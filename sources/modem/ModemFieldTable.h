@@ -17,7 +17,8 @@ namespace pyx::modem {
 // Every row of the mapping, in the order of ModemField.h's sources.
 [[nodiscard]] std::span<const ModemFieldRow> modemFieldTable();
 
-// What was left out, one line each ("Signal.Lte rsrp: -500 is out of range -156..-31 dBm...").
+// What was left out, one line each ("ModemManager Signal.Lte rsrp: -500.0 is out of range
+// -156..-31; left out"); rows that read the same key give the same line.
 using FieldIssues = std::vector<std::string>;
 
 // Applies the rows of source to dict.

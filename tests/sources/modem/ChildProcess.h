@@ -1,0 +1,47 @@
+// A program the tests start and always end: it is sent SIGTERM (then SIGKILL) when the object
+// goes, and dies with the test process if that one is killed first.
+#pragma once
+
+#include <sys/types.h>
+
+#include <chrono>
+#include <map>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace pyx::test {
+
+class ChildProcess {
+  public:
+    struct Options {
+        std::vector<std::string> argv;           // argv[0] is looked up on the PATH
+        std::map<std::string, std::string> env;  // added to (or replacing) this environment
+        bool captureStdout = false;              // readable with readLine()
+        std::string stderrFile;                  // empty: the test's stderr
+        std::string stdoutFile;                  // when not captured; empty: /dev/null
+    };
+
+    explicit ChildProcess(Options options);
+    ~ChildProcess();
+    ChildProcess(const ChildProcess&) = delete;
+    ChildProcess& operator=(const ChildProcess&) = delete;
+
+    // One line of the child's standard output, without its newline, or nothing when none came
+    // within timeout.
+    [[nodiscard]] std::optional<std::string> readLine(std::chrono::milliseconds timeout);
+
+    // Sends SIGTERM and waits for the exit status (SIGKILL after timeout): the exit code, or
+    // 128 + the signal that ended it.
+    int terminate(std::chrono::milliseconds timeout = std::chrono::seconds(10));
+    [[nodiscard]] bool running();
+    [[nodiscard]] pid_t pid() const { return pid_; }
+
+  private:
+    pid_t pid_ = -1;
+    int stdout_ = -1;
+    std::string buffered_;
+    std::optional<int> status_;
+};
+
+}  // namespace pyx::test
