@@ -113,6 +113,13 @@ bool ChildProcess::running() {
     return true;
 }
 
+int ChildProcess::wait(std::chrono::milliseconds timeout) {
+    const auto until = std::chrono::steady_clock::now() + timeout;
+    while (running() && std::chrono::steady_clock::now() < until)
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    return terminate();
+}
+
 int ChildProcess::terminate(std::chrono::milliseconds timeout) {
     if (status_) return *status_;
     if (pid_ <= 0) return -1;

@@ -34,6 +34,8 @@ class ChildProcess {
     // Sends SIGTERM and waits for the exit status (SIGKILL after timeout): the exit code, or
     // 128 + the signal that ended it.
     int terminate(std::chrono::milliseconds timeout = std::chrono::seconds(10));
+    // Waits for the child to end by itself (terminate() after timeout); its exit status.
+    int wait(std::chrono::milliseconds timeout);
     [[nodiscard]] bool running();
     [[nodiscard]] pid_t pid() const { return pid_; }
 
