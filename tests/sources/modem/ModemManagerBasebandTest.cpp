@@ -155,6 +155,17 @@ TEST_F(ModemSource, RefusedSignalSetupAndCellInfoAreSaidAndTheRestIsShown) {
     EXPECT_EQ(modem.logLines("ModemManager refused GetCellInfo"), 1);
 }
 
+TEST_F(ModemSource, AMethodThatTimesOutIsSaidOnceAndTheRestIsStillShown) {
+    fake.start(R"({"scenario": "slow", "delay": 2.5})");  // the transport waits 2 s at most
+    modem.start();
+    ASSERT_TRUE(showsRsrp("-97"));
+    ASSERT_TRUE(modem.waitForLog("ModemManager did not answer GetCellInfo within 2000 ms"));
+    const int polls = modem.metricEvents(kRsrpRsrqSinr);
+    ASSERT_TRUE(modem.waitFor([&] { return modem.metricEvents(kRsrpRsrqSinr) >= polls + 2; }));
+    EXPECT_EQ(modem.logLines("did not answer GetCellInfo"), 1);
+    EXPECT_EQ(modem.shown("LTE", "Serving Cell Meas", "rsrp0"), "-97");
+}
+
 TEST_F(ModemSource, WrongTypesAndMalformedStringsAreLeftOutWithOneLineEach) {
     fake.start(R"({"scenario": "malformed"})");
     modem.start();

@@ -4,13 +4,17 @@ Parameters (JSON, all optional):
   scenario   "mbim" (default): an LTE modem with cell info, two neighbours, a bearer, a SIM;
              "at": an LTE modem whose GetCellInfo is Unsupported and whose Lte has rsrp and
              rsrq only; "malformed": wrong types and malformed strings in every dictionary;
-             "refusing": Signal.Setup and GetCellInfo refused for want of authorisation
+             "refusing": Signal.Setup and GetCellInfo refused for want of authorisation;
+             "slow": as "mbim", but GetCellInfo answers only after "delay" seconds
   modem      false: ModemManager runs without a modem
   rsrp       the LTE RSRP the modem reports (default -97.0)
+  delay      how long the slow GetCellInfo takes (default 3.0 seconds)
 
 Mock methods (org.freedesktop.DBus.Mock): AddModem(scenario, index), RemoveModem(index),
 SetLteRsrp(rsrp).
 '''
+
+import time
 
 import dbus
 
@@ -30,7 +34,7 @@ SIM = 'org.freedesktop.ModemManager1.Sim'
 BEARER = 'org.freedesktop.ModemManager1.Bearer'
 
 ACCESS_LTE = 0x4000
-SETTINGS = {'rsrp': -97.0}
+SETTINGS = {'rsrp': -97.0, 'delay': 3.0}
 
 
 def sv(values):
@@ -57,6 +61,11 @@ def mbim_cells(_self):
         sv({'cell-type': dbus.UInt32(5), 'serving': False, 'physical-ci': '76',
             'earfcn': dbus.UInt32(6300), 'rsrp': -110.0, 'rsrq': -15.0}),
     ], signature='a{sv}')
+
+
+def slow_cells(self):
+    time.sleep(SETTINGS['delay'])
+    return mbim_cells(self)
 
 
 def malformed_cells(_self):
@@ -107,7 +116,8 @@ def add_modem(mock, scenario, index):
         'SignalQuality': dbus.Struct((dbus.UInt32(70), True), signature='ub'),
     }, [])
     modem = mockobject.objects[path]
-    cells = {'mbim': mbim_cells, 'malformed': malformed_cells}.get(scenario, unsupported)
+    cells = {'mbim': mbim_cells, 'slow': slow_cells, 'malformed': malformed_cells}.get(
+        scenario, unsupported)
     if scenario == 'refusing':
         cells = access_denied
     modem.AddMethods(MODEM, [('GetCellInfo', '', 'aa{sv}', cells)])
@@ -152,8 +162,9 @@ def add_modem(mock, scenario, index):
 def load(mock, parameters):
     mock.AddMethods(MAIN_IFACE, [('ScanDevices', '', '', ''), ('SetLogging', 's', '', '')])
     mock.AddProperty(MAIN_IFACE, 'Version', '1.20.4')
-    if 'rsrp' in parameters:
-        SETTINGS['rsrp'] = float(parameters['rsrp'])
+    for key in ('rsrp', 'delay'):
+        if key in parameters:
+            SETTINGS[key] = float(parameters[key])
     if parameters.get('modem', True):
         add_modem(mock, parameters.get('scenario', 'mbim'), 0)
 
