@@ -5,9 +5,13 @@
 #include <sdbus-c++/sdbus-c++.h>
 #include <algorithm>
 #include <atomic>
+#include <deque>
+#include <initializer_list>
 #include <map>
+#include <stop_token>
 #include <string_view>
 #include <utility>
+#include <vector>
 
 #include "baseband/velk/Names.h"
 #include "core/Format.h"

@@ -8,14 +8,11 @@
 
 #include <chrono>
 #include <cstdint>
-#include <deque>
 #include <memory>
 #include <mutex>
 #include <optional>
-#include <stop_token>
 #include <string>
 #include <thread>
-#include <vector>
 
 #include "baseband/velk/Transport.h"
 
