@@ -28,8 +28,9 @@ const char kModemTestConfiguration[] =
 
 namespace {
 
-modem::ModemManagerBaseband::Options testOptions() {
+modem::ModemManagerBaseband::Options testOptions(std::optional<std::uint32_t> modemIndex) {
     modem::ModemManagerBaseband::Options options;
+    options.modemIndex = modemIndex;
     options.callTimeout = std::chrono::milliseconds(2000);
     options.defaultPeriod = std::chrono::milliseconds(200);
     options.retryPeriod = std::chrono::milliseconds(200);
@@ -45,9 +46,9 @@ Dict command(std::initializer_list<std::pair<const char*, Value>> entries) {
 
 }  // namespace
 
-ModemHarness::ModemHarness()
+ModemHarness::ModemHarness(std::optional<std::uint32_t> modemIndex)
     : store_(MetricValidator::create(nullptr)),
-      transport_(std::make_unique<modem::ModemManagerBaseband>(testOptions())) {}
+      transport_(std::make_unique<modem::ModemManagerBaseband>(testOptions(modemIndex))) {}
 
 ModemHarness::~ModemHarness() {
     transport_->stopEvents();

@@ -24,7 +24,8 @@ extern const char kModemTestConfiguration[];
 
 class ModemHarness {
   public:
-    ModemHarness();
+    // The first modem, or the one whose object path ends in /Modem/modemIndex.
+    explicit ModemHarness(std::optional<std::uint32_t> modemIndex = std::nullopt);
     ~ModemHarness();
 
     // Pushes kModemTestConfiguration (asserting it is accepted) and starts the events.

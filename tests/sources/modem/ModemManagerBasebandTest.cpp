@@ -122,6 +122,24 @@ TEST_F(ModemSource, ServiceStoppedAndStartedAgainMidRunIsReattached) {
     EXPECT_EQ(modem.logLines("ModemManager is not running"), 1);
 }
 
+TEST_F(ModemSource, ModemNumberChoosesThatModemAndWaitsForOneNotThere) {
+    fake.start(R"({"scenario": "mbim"})");
+    fake.addModem("at", 3);
+    ModemHarness third(3);
+    third.start();
+    ASSERT_TRUE(
+        third.waitFor([&] { return third.shown("LTE", "Serving Cell Meas", "rsrq0") == "-11"; }));
+    EXPECT_EQ(third.logLines("using the modem /org/freedesktop/ModemManager1/Modem/3 (Pyxon Test "
+                             "AT LTE)"),
+              1);
+
+    ModemHarness fifth(5);
+    fifth.start();
+    ASSERT_TRUE(fifth.waitForLog(
+        "ModemManager has no modem /org/freedesktop/ModemManager1/Modem/5; waiting for it"));
+    EXPECT_EQ(fifth.metricEvents(kRsrpRsrqSinr), 0);
+}
+
 TEST_F(ModemSource, ModemManagerAbsentAtStartIsSaidOnceAndWaitedFor) {
     modem.start();
     ASSERT_TRUE(modem.waitForLog("ModemManager is not running"));
