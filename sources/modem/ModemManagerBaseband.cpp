@@ -582,7 +582,13 @@ class Poller {
 }  // namespace
 
 ModemManagerBaseband::ModemManagerBaseband(Options options)
-    : options_(options), shared_(std::make_shared<Shared>()) {}
+    : options_(options), shared_(std::make_shared<Shared>()) {
+    // sdbus-c++ keeps a process-wide bus for the messages inside variants, made on first use
+    // and destroyed at exit in the reverse order of making. Making it now, before the manager
+    // that will own this transport, lets it outlive the polling thread, which that manager
+    // stops at exit.
+    static_cast<void>(sdbus::Variant());
+}
 
 ModemManagerBaseband::~ModemManagerBaseband() {
     const std::lock_guard control(controlMutex_);

@@ -40,7 +40,11 @@ class ModemPrograms : public ::testing::Test {
             return -1;
         }
         if (thenDo) thenDo();
-        return program.terminate();
+        const int code = program.terminate();
+        if (code != 0)
+            ADD_FAILURE() << argv[0] << " ended with " << code << " on SIGTERM; it said:\n"
+                          << readFile(stderrFile);
+        return code;
     }
 
     bool waitForStderr(const std::string& part) {
