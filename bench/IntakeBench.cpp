@@ -172,7 +172,7 @@ void registerScreen(const std::vector<CorpusRecord>& corpus) {
         const auto categories = items.firstLevelViewItems.find(group);
         if (categories == items.firstLevelViewItems.end()) continue;
         for (const std::string& category : categories->second) {
-            auto screen = std::make_shared<SecondLevelViewController>(validator);
+            auto screen = std::make_shared<SecondLevelViewController>(*validator);
             screen->setFirstSelection(group);
             screen->setSeguedThroughRow(category);
             const std::int64_t cells = answerInFull(*screen);

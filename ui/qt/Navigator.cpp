@@ -6,17 +6,12 @@
 #include <utility>
 
 #include "core/MainQueue.h"
-#include "ui/FirstLevelViewController.h"
 #include "ui/PyxViewController.h"
-#include "ui/SecondLevelViewController.h"
-#include "ui/ThirdLevelViewController.h"
 
 namespace pyx::qt {
 
-Screen::Screen(Level level, QString title, std::shared_ptr<TableController> controller,
-               QObject* parent)
+Screen::Screen(QString title, std::shared_ptr<TableController> controller, QObject* parent)
     : QObject(parent),
-      level_(level),
       title_(std::move(title)),
       controller_(std::move(controller)),
       model_(new TableModel(controller_, this)) {}
@@ -29,11 +24,15 @@ void Screen::update() {
 
 Navigator::Navigator(std::shared_ptr<MetricValidator> validator, QObject* parent)
     : QObject(parent), validator_(std::move(validator)) {
-    stack_.push_back(new Screen(Screen::Launch, QStringLiteral("Pyxon"),
-                                std::make_shared<PyxViewController>(), this));
+    stack_.push_back(new Screen(QStringLiteral("Pyxon"),
+                                std::make_shared<PyxViewController>(*validator_), this));
 }
 
-Navigator::~Navigator() = default;
+Navigator::~Navigator() {
+    // The screens' controllers refer to the store: they go before it does.
+    qDeleteAll(retired_);
+    qDeleteAll(stack_);
+}
 
 Screen* Navigator::screenAt(int level) const {
     if (level < 0 || level >= depth()) return nullptr;
@@ -53,45 +52,14 @@ void Navigator::setAnimated(bool animated) {
 }
 
 bool Navigator::select(int index) {
-    Screen* const top = current();
-    const auto path = top->model()->indexPath(index);
-    if (!path) return false;
-    const int row = path->second;
-    const auto fromText = [](const std::optional<std::string>& text) {
-        return text ? QString::fromStdString(*text) : QString();
-    };
-    switch (top->level()) {
-        case Screen::Launch: {
-            auto menu = std::make_shared<FirstLevelViewController>(validator_);
-            static_cast<PyxViewController&>(top->controller()).prepareFirstLevel(*menu, row);
-            const QString title = fromText(menu->seguedThroughRow());
-            push(new Screen(Screen::FirstLevel, title, std::move(menu), this));
-            return true;
-        }
-        case Screen::FirstLevel: {
-            auto category = std::make_shared<SecondLevelViewController>(validator_);
-            static_cast<FirstLevelViewController&>(top->controller())
-                .prepareSecondLevel(*category, row);
-            const QString title = fromText(category->seguedThroughRow());
-            push(new Screen(Screen::SecondLevel, title, std::move(category), this));
-            return true;
-        }
-        case Screen::SecondLevel: {
-            const auto& from = static_cast<SecondLevelViewController&>(top->controller());
-            const std::optional<Cell> tapped = top->model()->cellAt(index);
-            if (!tapped) return false;
-            auto details = std::make_shared<ThirdLevelViewController>();
-            // The category screen hands nothing on: the placeholder's selections stay unset.
-            // Only the title bar names the entry that was tapped.
-            from.prepareForSegue(*details, &*tapped);
-            QString title = fromText(tapped->text);
-            if (title.isEmpty()) title = top->title();
-            push(new Screen(Screen::ThirdLevel, title, std::move(details), this));
-            return true;
-        }
-        default:
-            return false;
-    }
+    const Screen* const top = current();
+    if (!top->model()->indexPath(index)) return false;
+    const std::optional<Cell> tapped = top->model()->cellAt(index);
+    if (!tapped) return false;
+    std::optional<Destination> next = top->controller().open(*tapped);
+    if (!next) return false;
+    push(new Screen(QString::fromStdString(next->title), std::move(next->controller), this));
+    return true;
 }
 
 void Navigator::push(Screen* screen) {

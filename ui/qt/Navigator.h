@@ -21,31 +21,24 @@ class Screen : public QObject {
     Q_OBJECT
     Q_PROPERTY(QString title READ title CONSTANT)
     Q_PROPERTY(pyx::qt::TableModel* model READ model CONSTANT)
-    Q_PROPERTY(int level READ level CONSTANT)
     Q_PROPERTY(bool refreshes READ refreshes CONSTANT)
     Q_PROPERTY(bool leadsFurther READ leadsFurther CONSTANT)
 
   public:
-    enum Level { Launch = 0, FirstLevel = 1, SecondLevel = 2, ThirdLevel = 3 };
-    Q_ENUM(Level)
-
-    Screen(Level level, QString title, std::shared_ptr<TableController> controller,
-           QObject* parent = nullptr);
+    Screen(QString title, std::shared_ptr<TableController> controller, QObject* parent = nullptr);
 
     [[nodiscard]] QString title() const { return title_; }
     [[nodiscard]] TableModel* model() const { return model_; }
-    [[nodiscard]] int level() const { return level_; }
-    // The category screen follows the store: the view reloads it periodically.
-    [[nodiscard]] bool refreshes() const { return level_ == SecondLevel; }
-    // Whether tapping a row opens a further screen.
-    [[nodiscard]] bool leadsFurther() const { return level_ != ThirdLevel; }
+    // A screen that shows the store: the view reloads it periodically.
+    [[nodiscard]] bool refreshes() const { return controller_->followsStore(); }
+    // Whether its rows are menu entries leading to a further list.
+    [[nodiscard]] bool leadsFurther() const { return controller_->leadsFurther(); }
     [[nodiscard]] TableController& controller() const { return *controller_; }
 
     // The periodic refresh: posts one reload of the table to the main queue.
     Q_INVOKABLE void update();
 
   private:
-    Level level_;
     QString title_;
     std::shared_ptr<TableController> controller_;
     TableModel* model_;
@@ -75,8 +68,8 @@ class Navigator : public QObject {
     [[nodiscard]] bool animated() const { return animated_; }
     void setAnimated(bool animated);
 
-    // The tap on item index of the top screen: pushes the next screen. False for a header,
-    // an index out of range, or the deepest screen.
+    // The tap on item index of the top screen: pushes the screen its controller opens. False
+    // for a header, an index out of range, or a screen whose rows open nothing.
     Q_INVOKABLE bool select(int index);
     // Pops the top screen; false on the launch list.
     Q_INVOKABLE bool back();
