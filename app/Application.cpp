@@ -20,8 +20,10 @@
 #include "core/Log.h"
 #include "core/MainQueue.h"
 #include "metrics/MetricValidator.h"
+#include "metrics/history/History.h"
 #include "sources/Source.h"
 #ifdef PYXON_HAVE_WINDOW
+#include "ui/ChartScreens.h"
 #include "ui/qt/QtFrontEnd.h"
 #endif
 
@@ -34,7 +36,12 @@ struct Options {
     std::uint64_t seed = 1;
     double speed = 1.0;
     std::optional<std::string> screenshots;
+    std::optional<std::string> chart;
 };
+
+// Screenshots are taken after this much simulated time per second, unless --speed says
+// otherwise, so that the charts have long lines.
+constexpr double kScreenshotSpeed = 30;
 
 // SIGINT and SIGTERM are blocked in every thread (set before any thread starts) and taken by
 // one waiting thread, which stops the main queue; the queue then runs what was queued by then.
@@ -97,11 +104,17 @@ int runPyxon(int argc, char** argv) {
     cli.add_option("--screenshots", options.screenshots,
                    "Render every screen to PNG files in this folder, then quit")
         ->type_name("DIR");
+    cli.add_option("--chart", options.chart,
+                   "Open the chart page of the screen GROUP/CATEGORY at start (window only)")
+        ->type_name("GROUP/CATEGORY");
     cli.set_version_flag("--version", std::string("pyxon ") + PYXON_VERSION);
     cli.footer(std::string(sources::sourceHelp()) +
                "\nExamples:\n"
                "  pyxon --headless --speed 20\n"
-               "  pyxon --source modem\n");
+               "  pyxon --source modem\n"
+               "  pyxon --chart 'LTE/Serving Cell Meas'\n"
+               "  pyxon --screenshots shots   (simulated time runs 30 times faster unless "
+               "--speed is given)\n");
     try {
         cli.parse(argc, argv);
     } catch (const CLI::CallForHelp& e) {
@@ -131,6 +144,25 @@ int runPyxon(int argc, char** argv) {
         std::cerr << "pyxon: --screenshots needs the window\n";
         return 2;
     }
+    std::optional<std::pair<std::string, std::string>> chart;
+    if (options.chart) {
+        const auto slash = options.chart->find('/');
+        if (slash != std::string::npos)
+            chart.emplace(options.chart->substr(0, slash), options.chart->substr(slash + 1));
+#ifdef PYXON_HAVE_WINDOW
+        if (!chart || !chartForCategory(chart->first + " " + chart->second)) {
+            std::cerr << "pyxon: --chart: \"" << *options.chart
+                      << "\" is not a screen with a chart (e.g. \"LTE/Serving Cell Meas\")\n";
+            return 2;
+        }
+#endif
+        if (!window) {
+            std::cerr << "pyxon: --chart needs the window\n";
+            return 2;
+        }
+    }
+    if (options.screenshots && cli.get_option("--speed")->count() == 0)
+        options.speed = kScreenshotSpeed;
 
     std::optional<StopOnSignal> stopOnSignal;
     if (!window) stopOnSignal.emplace();
@@ -153,12 +185,15 @@ int runPyxon(int argc, char** argv) {
     // Creation order: the client's shared instance, then the store's (which listens and then
     // becomes the delegate), then the start-up sequence once the root view has loaded.
     RootNavigationController root;
+    // The charts' history, fed by the store on every stored arrival.
+    root.myMetricValidator->setHistory(std::make_shared<History>());
 
     int status = 0;
 #ifdef PYXON_HAVE_WINDOW
     if (window) {
         WindowOptions windowOptions;
         windowOptions.screenshotDir = options.screenshots;
+        windowOptions.chart = chart;
         status = runWindow(argc, argv, windowOptions, [&root] { root.viewDidLoad(); });
     } else {
         status = runHeadless(root);

@@ -244,6 +244,11 @@ Cell SecondLevelViewController::cellForRowAtIndexPath(int section, int row) cons
 
 void SecondLevelViewController::prepareForSegue(TableController&, const Cell*) const {}
 
+std::optional<std::string> SecondLevelViewController::shownCategory() const {
+    if (!firstSelection_ || !seguedThroughRow_) return std::nullopt;
+    return categoryKey();
+}
+
 std::optional<Destination> SecondLevelViewController::open(const Cell& tapped) const {
     auto details = std::make_shared<ThirdLevelViewController>();
     prepareForSegue(*details, &tapped);

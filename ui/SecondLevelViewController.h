@@ -58,6 +58,8 @@ class SecondLevelViewController : public TableController {
     // row has no text); it receives nothing else.
     [[nodiscard]] std::optional<Destination> open(const Cell& tapped) const override;
     [[nodiscard]] bool followsStore() const override { return true; }
+    // categoryKey, or nothing while a selection is not set.
+    [[nodiscard]] std::optional<std::string> shownCategory() const override;
 
   private:
     const PyxViewItems tableViewFields_ = makePyxViewItems();

@@ -42,6 +42,9 @@ class TableController {
     [[nodiscard]] virtual bool leadsFurther() const { return false; }
     // Whether the screen shows the store, so that the view reloads it periodically.
     [[nodiscard]] virtual bool followsStore() const { return false; }
+    // The category key of the store's contents the screen shows ("LTE C-DRX"); nothing for a
+    // screen that shows no category.
+    [[nodiscard]] virtual std::optional<std::string> shownCategory() const { return std::nullopt; }
 };
 
 }  // namespace pyx

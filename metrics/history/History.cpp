@@ -77,6 +77,7 @@ void History::record(MetricValidator::DictionaryProperty property, const Dict& s
         if (quantities[i].property != property) continue;
         if (!fed) {
             fed = true;
+            ++revision_;
             if (newestMs_ && timeMs + limits_.backwardsToleranceMs < *newestMs_)
                 startSession(timeMs);
             else if (!newestMs_ || timeMs > *newestMs_)

@@ -60,6 +60,8 @@ class History {
     [[nodiscard]] std::optional<double> newestMs() const { return newestMs_; }
     // Counts the times the history started over because time went backwards.
     [[nodiscard]] std::uint32_t session() const { return session_; }
+    // Changes whenever a point is added: readers redraw only when it has.
+    [[nodiscard]] std::uint64_t revision() const { return revision_; }
     [[nodiscard]] std::size_t seriesCount() const { return series_.size(); }
     [[nodiscard]] const Limits& limits() const { return limits_; }
 
@@ -84,6 +86,7 @@ class History {
     std::vector<std::pair<float, const Dict*>> strongest_;  // scratch for the ranking
     std::optional<double> newestMs_;
     std::uint32_t session_ = 0;
+    std::uint64_t revision_ = 0;
 };
 
 }  // namespace pyx

@@ -6,17 +6,27 @@
 #include <utility>
 
 #include "core/MainQueue.h"
+#include "metrics/history/History.h"
+#include "ui/ChartScreens.h"
 #include "ui/PyxViewController.h"
 
 namespace pyx::qt {
 
-Screen::Screen(QString title, std::shared_ptr<TableController> controller, QObject* parent)
+Screen::Screen(QString title, std::shared_ptr<TableController> controller,
+               std::optional<Chart> charted, QObject* parent)
     : QObject(parent),
       title_(std::move(title)),
       controller_(std::move(controller)),
-      model_(new TableModel(controller_, this)) {}
+      model_(new TableModel(controller_, this)),
+      charted_(charted) {}
+
+Screen::Screen(QString title, ChartModel* chart, QObject* parent)
+    : QObject(parent), title_(std::move(title)), chart_(chart) {
+    chart_->setParent(this);
+}
 
 void Screen::update() {
+    if (model_ == nullptr) return;
     MainQueue::shared().post([model = QPointer<TableModel>(model_)] {
         if (model) model->reload();
     });
@@ -25,7 +35,8 @@ void Screen::update() {
 Navigator::Navigator(std::shared_ptr<MetricValidator> validator, QObject* parent)
     : QObject(parent), validator_(std::move(validator)) {
     stack_.push_back(new Screen(QStringLiteral("Pyxon"),
-                                std::make_shared<PyxViewController>(*validator_), this));
+                                std::make_shared<PyxViewController>(*validator_), std::nullopt,
+                                this));
 }
 
 Navigator::~Navigator() {
@@ -53,12 +64,26 @@ void Navigator::setAnimated(bool animated) {
 
 bool Navigator::select(int index) {
     const Screen* const top = current();
-    if (!top->model()->indexPath(index)) return false;
+    if (top->model() == nullptr || !top->model()->indexPath(index)) return false;
     const std::optional<Cell> tapped = top->model()->cellAt(index);
     if (!tapped) return false;
     std::optional<Destination> next = top->controller().open(*tapped);
     if (!next) return false;
-    push(new Screen(QString::fromStdString(next->title), std::move(next->controller), this));
+    std::optional<Chart> charted;
+    if (validator_->history())
+        if (const auto category = next->controller->shownCategory())
+            charted = chartForCategory(*category);
+    push(new Screen(QString::fromStdString(next->title), std::move(next->controller), charted,
+                    this));
+    return true;
+}
+
+bool Navigator::openChart() {
+    const Screen* const top = current();
+    const std::shared_ptr<const History> history = validator_->history();
+    if (!top->chartOffered() || !history) return false;
+    const Chart chart = *top->chartOffered();
+    push(new Screen(QString::fromUtf8(chartTitle(chart)), new ChartModel(history, chart), this));
     return true;
 }
 
@@ -85,6 +110,7 @@ void Navigator::popToRoot() {
 bool Navigator::open(const QStringList& titles) {
     popToRoot();
     for (const QString& title : titles) {
+        if (current()->model() == nullptr) return false;
         const TableModel& model = *current()->model();
         int found = -1;
         for (int i = 0; i < model.count() && found < 0; ++i) {

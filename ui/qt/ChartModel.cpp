@@ -1,0 +1,143 @@
+#include "ui/qt/ChartModel.h"
+
+#include <QXYSeries>
+
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
+namespace pyx::qt {
+
+ChartModel::ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent)
+    : QObject(parent), history_(std::move(history)), chart_(chart) {
+    rebuild();
+}
+
+QString ChartModel::title() const {
+    return QString::fromUtf8(chartTitle(chart_));
+}
+
+void ChartModel::setWindowMinutes(int minutes) {
+    if (minutes == windowMinutes_ || !windowChoices().contains(minutes)) return;
+    windowMinutes_ = minutes;
+    emit windowMinutesChanged();
+    rebuild();
+    emit changed();
+}
+
+QString ChartModel::emptyText() const {
+    if (!empty()) return {};
+    if (!history_->newestMs())
+        return QStringLiteral(
+            "Nothing has arrived yet. The chart starts with the first "
+            "measurement.");
+    return QStringLiteral(
+               "No %1 measurement in the last %2 min. The source has not reported "
+               "any of: %3.")
+        .arg(title(), QString::number(windowMinutes_), missingText_);
+}
+
+const ChartModel::Panel* ChartModel::panelAt(int panel) const {
+    if (panel < 0 || panel >= panelCount()) return nullptr;
+    return &panels_[static_cast<std::size_t>(panel)];
+}
+
+QString ChartModel::unit(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? QString::fromUtf8(unitText(p->unit)) : QString();
+}
+
+QStringList ChartModel::seriesNames(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->names : QStringList();
+}
+
+double ChartModel::minimum(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->minimum : 0;
+}
+
+double ChartModel::maximum(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->maximum : 0;
+}
+
+QList<QPointF> ChartModel::points(int panel, int index) const {
+    const Panel* p = panelAt(panel);
+    if (p == nullptr || index < 0 || index >= static_cast<int>(p->lines.size())) return {};
+    return p->lines[static_cast<std::size_t>(index)];
+}
+
+void ChartModel::fill(int panel, int index, QObject* series) const {
+    if (auto* const line = qobject_cast<QXYSeries*>(series)) line->replace(points(panel, index));
+}
+
+void ChartModel::refresh() {
+    if (read_ && history_->revision() == readRevision_ && history_->session() == readSession_)
+        return;
+    rebuild();
+    emit changed();
+}
+
+void ChartModel::rebuild() {
+    read_ = true;
+    readRevision_ = history_->revision();
+    readSession_ = history_->session();
+    panels_.clear();
+    toMs_ = history_->newestMs().value_or(0);
+    fromMs_ = toMs_ - windowMinutes_ * 60'000.0;
+
+    const auto series = history_->seriesOf(chart_, fromMs_);
+    // Panels in the order their units first occur among the chart's quantities.
+    const auto quantities = historyQuantities();
+    std::vector<bool> present(quantities.size(), false);
+    for (const Series* s : series) present[s->key().quantity] = true;
+    QStringList missing;
+    for (std::size_t i = 0; i < quantities.size(); ++i) {
+        const Quantity& q = quantities[i];
+        if (q.chart != chart_) continue;
+        if (!present[i]) {
+            const QString name = QString::fromUtf8(q.name);
+            if (!missing.contains(name)) missing << name;
+            continue;
+        }
+        const bool known = std::any_of(panels_.begin(), panels_.end(),
+                                       [&](const Panel& p) { return p.unit == q.unit; });
+        if (!known) panels_.push_back(Panel{q.unit, {}, {}, 0, 0});
+    }
+    missingText_ = missing.join(QStringLiteral(", "));
+
+    for (Panel& panel : panels_) {
+        double low = INFINITY;
+        double high = -INFINITY;
+        for (const Series* s : series) {
+            if (s->quantity().unit != panel.unit) continue;
+            QList<QPointF> line;
+            const SeriesRing& ring = s->points();
+            line.reserve(static_cast<qsizetype>(ring.size() * 2));
+            for (std::size_t i = 0; i < ring.size(); ++i) {
+                const Bucket& b = ring.at(i);
+                if (b.timeMs < fromMs_) continue;
+                low = std::min(low, static_cast<double>(b.min));
+                high = std::max(high, static_cast<double>(b.max));
+                if (b.min == b.max) {
+                    line.append(QPointF(b.timeMs, b.min));
+                    continue;
+                }
+                // Both ends of the slot, the one that came last drawn last.
+                const bool endsHigh = b.last == b.max;
+                line.append(QPointF(b.timeMs, endsHigh ? b.min : b.max));
+                line.append(QPointF(b.timeMs + 1, endsHigh ? b.max : b.min));
+            }
+            panel.names << QString::fromStdString(s->label());
+            panel.lines.push_back(std::move(line));
+        }
+        // Room above and below the lines, and at least a few units of range.
+        const double span = std::max(high - low, 4.0);
+        const double middle = (high + low) / 2;
+        panel.minimum = std::floor(middle - span * 0.6);
+        panel.maximum = std::ceil(middle + span * 0.6);
+    }
+}
+
+}  // namespace pyx::qt
