@@ -23,12 +23,12 @@ struct ChartInfo {
 };
 
 inline constexpr std::array kCharts = {
-    ChartInfo{Chart::LteServing, "LTE serving cell"},
-    ChartInfo{Chart::LteCarriers, "LTE carrier aggregation"},
+    ChartInfo{Chart::LteServing, "LTE serving"},
+    ChartInfo{Chart::LteCarriers, "LTE carriers"},
     ChartInfo{Chart::LteNeighbours, "LTE neighbours"},
-    ChartInfo{Chart::UmtsServing, "UMTS serving cell"},
+    ChartInfo{Chart::UmtsServing, "UMTS serving"},
     ChartInfo{Chart::UmtsNeighbours, "UMTS neighbours"},
-    ChartInfo{Chart::GsmServing, "GSM serving cell"},
+    ChartInfo{Chart::GsmServing, "GSM serving"},
     ChartInfo{Chart::GsmNeighbours, "GSM neighbours"},
 };
 

@@ -16,6 +16,13 @@ FocusScope {
     readonly property ChartModel chart: screen ? screen.chart : null
     readonly property bool dark: colors ? colors.base.hslLightness < 0.5 : false
     readonly property bool shown: StackView.status === StackView.Active
+    // Line colours, told apart on either background.
+    readonly property var lightLines: ["#1f77b4", "#d62728", "#2ca02c", "#ff7f0e", "#9467bd", "#8c564b", "#e377c2", "#17becf", "#7f7f7f", "#bcbd22"]
+    readonly property var darkLines: ["#5aa9e6", "#ff6b6b", "#63d471", "#ffa94d", "#b197fc", "#d4a373", "#f783ac", "#3bc9db", "#ced4da", "#e9ec5f"]
+    function lineColor(index) {
+        const lines = page.dark ? page.darkLines : page.lightLines
+        return lines[index % lines.length]
+    }
     // Ticks fit the width: about one per 90 pixels, at least three.
     readonly property int timeTicks: Math.max(3, Math.min(7, Math.floor(width / 90)))
 
@@ -121,67 +128,103 @@ FocusScope {
 
         Repeater {
             model: page.chart ? page.chart.panelCount : 0
-            delegate: ChartView {
+            delegate: Item {
                 id: panel
                 required property int index
-                property string shownNames: ""
+                property string shown: ""
+                property var names: []
                 objectName: "panel" + index
                 width: panels.width
                 height: panels.height / Math.max(1, page.chart.panelCount)
-                antialiasing: true
-                animationOptions: ChartView.NoAnimation
-                theme: page.dark ? ChartView.ChartThemeDark : ChartView.ChartThemeLight
-                backgroundColor: page.colors.base
-                backgroundRoundness: 0
-                plotAreaColor: page.colors.base
-                margins { top: 2; bottom: 2; left: 4; right: 8 }
-                legend.alignment: Qt.AlignBottom
-                legend.labelColor: page.colors.text
-                legend.font.pixelSize: 12
-                localizeNumbers: false
 
-                DateTimeAxis {
-                    id: timeAxis
-                    format: page.chart && page.chart.windowMinutes <= 1 ? "HH:mm:ss" : "HH:mm"
-                    tickCount: page.timeTicks
-                    labelsColor: page.colors.text
-                    labelsFont.pixelSize: 11
-                    gridLineColor: Qt.rgba(page.colors.text.r, page.colors.text.g, page.colors.text.b, 0.12)
-                    lineVisible: false
+                ChartView {
+                    id: view
+                    anchors { left: parent.left; right: parent.right; top: parent.top; bottom: legend.top }
+                    antialiasing: true
+                    animationOptions: ChartView.NoAnimation
+                    theme: page.dark ? ChartView.ChartThemeDark : ChartView.ChartThemeLight
+                    backgroundColor: page.colors.base
+                    backgroundRoundness: 0
+                    plotAreaColor: page.colors.base
+                    margins { top: 2; bottom: 0; left: 4; right: 8 }
+                    legend.visible: false
+                    localizeNumbers: false
+
+                    DateTimeAxis {
+                        id: timeAxis
+                        format: page.chart && page.chart.windowMinutes <= 1 ? "HH:mm:ss" : "HH:mm"
+                        tickCount: page.timeTicks
+                        labelsColor: page.colors.text
+                        labelsFont.pixelSize: 11
+                        gridLineColor: Qt.rgba(page.colors.text.r, page.colors.text.g, page.colors.text.b, 0.12)
+                        lineVisible: false
+                    }
+                    ValueAxis {
+                        id: valueAxis
+                        labelFormat: "%.0f"
+                        tickCount: 5
+                        titleText: page.chart ? page.chart.unit(panel.index) : ""
+                        titleFont.pixelSize: 12
+                        titleBrush: page.colors.text
+                        labelsColor: page.colors.text
+                        labelsFont.pixelSize: 11
+                        gridLineColor: Qt.rgba(page.colors.text.r, page.colors.text.g, page.colors.text.b, 0.12)
+                        lineVisible: false
+                    }
                 }
-                ValueAxis {
-                    id: valueAxis
-                    labelFormat: "%.0f"
-                    tickCount: 5
-                    titleText: page.chart ? page.chart.unit(panel.index) : ""
-                    titleFont.pixelSize: 12
-                    titleBrush: page.colors.text
-                    labelsColor: page.colors.text
-                    labelsFont.pixelSize: 11
-                    gridLineColor: Qt.rgba(page.colors.text.r, page.colors.text.g, page.colors.text.b, 0.12)
-                    lineVisible: false
+
+                // The legend wraps onto as many rows as its names need.
+                Flow {
+                    id: legend
+                    objectName: "legend"
+                    anchors { left: parent.left; right: parent.right; bottom: parent.bottom; leftMargin: 16; rightMargin: 8; bottomMargin: 6 }
+                    spacing: 10
+                    Repeater {
+                        model: panel.names
+                        delegate: Row {
+                            required property string modelData
+                            required property int index
+                            spacing: 4
+                            Rectangle {
+                                width: 14; height: 3; radius: 1
+                                anchors.verticalCenter: parent.verticalCenter
+                                color: page.lineColor(parent.index)
+                            }
+                            Text {
+                                text: parent.modelData
+                                font.pixelSize: 12
+                                color: page.colors.text
+                            }
+                        }
+                    }
                 }
 
                 function redraw() {
                     if (!page.chart || panel.index >= page.chart.panelCount)
                         return
                     const names = page.chart.seriesNames(panel.index)
-                    const joined = names.join("\n")
-                    if (joined !== panel.shownNames) {
-                        panel.removeAllSeries()
-                        for (let i = 0; i < names.length; ++i) {
-                            const line = panel.createSeries(ChartView.SeriesTypeLine, names[i], timeAxis, valueAxis)
+                    const segments = page.chart.segmentCount(panel.index)
+                    let owners = []
+                    for (let k = 0; k < segments; ++k)
+                        owners.push(page.chart.segmentLine(panel.index, k))
+                    const signature = names.join("\n") + "|" + owners.join(",") + "|" + page.dark
+                    if (signature !== panel.shown) {
+                        view.removeAllSeries()
+                        for (let k = 0; k < segments; ++k) {
+                            const line = view.createSeries(ChartView.SeriesTypeLine, names[owners[k]], timeAxis, valueAxis)
+                            line.color = page.lineColor(owners[k])
                             line.width = 2
                         }
-                        panel.shownNames = joined
+                        panel.names = names
+                        panel.shown = signature
                     }
                     timeAxis.min = new Date(page.chart.fromMs)
                     timeAxis.max = new Date(page.chart.toMs)
                     valueAxis.min = page.chart.minimum(panel.index)
                     valueAxis.max = page.chart.maximum(panel.index)
                     valueAxis.applyNiceNumbers()
-                    for (let i = 0; i < panel.count; ++i)
-                        page.chart.fill(panel.index, i, panel.series(i))
+                    for (let k = 0; k < view.count; ++k)
+                        page.chart.fill(panel.index, k, view.series(k))
                 }
 
                 Component.onCompleted: redraw()

@@ -7,6 +7,12 @@
 #include <utility>
 
 namespace pyx::qt {
+namespace {
+
+// A line breaks where its points stop for longer than this (or three slots, if longer).
+constexpr double kGapMs = 10'000;
+
+}  // namespace
 
 ChartModel::ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent)
     : QObject(parent), history_(std::move(history)), chart_(chart) {
@@ -62,10 +68,21 @@ double ChartModel::maximum(int panel) const {
     return p ? p->maximum : 0;
 }
 
-QList<QPointF> ChartModel::points(int panel, int index) const {
+int ChartModel::segmentCount(int panel) const {
     const Panel* p = panelAt(panel);
-    if (p == nullptr || index < 0 || index >= static_cast<int>(p->lines.size())) return {};
-    return p->lines[static_cast<std::size_t>(index)];
+    return p ? static_cast<int>(p->segments.size()) : 0;
+}
+
+int ChartModel::segmentLine(int panel, int segment) const {
+    const Panel* p = panelAt(panel);
+    if (p == nullptr || segment < 0 || segment >= static_cast<int>(p->segments.size())) return -1;
+    return p->segmentLines[static_cast<std::size_t>(segment)];
+}
+
+QList<QPointF> ChartModel::points(int panel, int segment) const {
+    const Panel* p = panelAt(panel);
+    if (p == nullptr || segment < 0 || segment >= static_cast<int>(p->segments.size())) return {};
+    return p->segments[static_cast<std::size_t>(segment)];
 }
 
 void ChartModel::fill(int panel, int index, QObject* series) const {
@@ -103,21 +120,32 @@ void ChartModel::rebuild() {
         }
         const bool known = std::any_of(panels_.begin(), panels_.end(),
                                        [&](const Panel& p) { return p.unit == q.unit; });
-        if (!known) panels_.push_back(Panel{q.unit, {}, {}, 0, 0});
+        if (!known) panels_.push_back(Panel{q.unit, {}, {}, {}, 0, 0});
     }
     missingText_ = missing.join(QStringLiteral(", "));
 
+    const double gapMs =
+        std::max(kGapMs, 3 * history_->limits().windowMs /
+                             static_cast<double>(history_->limits().pointsPerSeries));
     for (Panel& panel : panels_) {
         double low = INFINITY;
         double high = -INFINITY;
         for (const Series* s : series) {
             if (s->quantity().unit != panel.unit) continue;
+            const int lineIndex = static_cast<int>(panel.names.size());
+            panel.names << QString::fromStdString(s->label());
             QList<QPointF> line;
             const SeriesRing& ring = s->points();
-            line.reserve(static_cast<qsizetype>(ring.size() * 2));
+            double previousMs = -INFINITY;
             for (std::size_t i = 0; i < ring.size(); ++i) {
                 const Bucket& b = ring.at(i);
                 if (b.timeMs < fromMs_) continue;
+                if (b.timeMs - previousMs > gapMs && !line.isEmpty()) {
+                    panel.segments.push_back(std::move(line));
+                    panel.segmentLines.push_back(lineIndex);
+                    line = QList<QPointF>();
+                }
+                previousMs = b.timeMs;
                 low = std::min(low, static_cast<double>(b.min));
                 high = std::max(high, static_cast<double>(b.max));
                 if (b.min == b.max) {
@@ -129,8 +157,10 @@ void ChartModel::rebuild() {
                 line.append(QPointF(b.timeMs, endsHigh ? b.min : b.max));
                 line.append(QPointF(b.timeMs + 1, endsHigh ? b.max : b.min));
             }
-            panel.names << QString::fromStdString(s->label());
-            panel.lines.push_back(std::move(line));
+            if (!line.isEmpty()) {
+                panel.segments.push_back(std::move(line));
+                panel.segmentLines.push_back(lineIndex);
+            }
         }
         // Room above and below the lines, and at least a few units of range.
         const double span = std::max(high - low, 4.0);

@@ -58,11 +58,16 @@ class ChartModel : public QObject {
     Q_INVOKABLE QStringList seriesNames(int panel) const;
     Q_INVOKABLE double minimum(int panel) const;
     Q_INVOKABLE double maximum(int panel) const;
-    // The points of line index of the panel: x in ms since 1970, each slot as its minimum and
-    // maximum in the order they came.
-    [[nodiscard]] QList<QPointF> points(int panel, int index) const;
+    // A line is drawn as one or more segments: it breaks where its points stop for a while
+    // (a neighbour that was not among the strongest, a kind that paused).
+    Q_INVOKABLE int segmentCount(int panel) const;
+    // The line (index into seriesNames) that segment belongs to.
+    Q_INVOKABLE int segmentLine(int panel, int segment) const;
+    // The points of a segment: x in ms since 1970, each slot as its minimum and maximum in
+    // the order they came.
+    [[nodiscard]] QList<QPointF> points(int panel, int segment) const;
     // Puts those points into a line series of the chart view (replacing its points).
-    Q_INVOKABLE void fill(int panel, int index, QObject* series) const;
+    Q_INVOKABLE void fill(int panel, int segment, QObject* series) const;
 
     // Reads the history again if points were added or the window changed; emits changed
     // when it did.
@@ -76,7 +81,8 @@ class ChartModel : public QObject {
     struct Panel {
         Unit unit = Unit::Dbm;
         QStringList names;
-        std::vector<QList<QPointF>> lines;
+        std::vector<QList<QPointF>> segments;
+        std::vector<int> segmentLines;
         double minimum = 0;
         double maximum = 0;
     };
