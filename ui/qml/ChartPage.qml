@@ -100,7 +100,6 @@ FocusScope {
         objectName: "missingText"
         anchors { top: selector.bottom; topMargin: 6; left: parent.left; right: parent.right; leftMargin: 16; rightMargin: 16 }
         visible: page.chart !== null && !page.chart.empty && page.chart.missingText.length > 0
-        height: visible ? implicitHeight : 0
         text: page.chart ? "Not reported: " + page.chart.missingText : ""
         wrapMode: Text.Wrap
         font.pixelSize: 13
@@ -123,7 +122,7 @@ FocusScope {
     Column {
         id: panels
         objectName: "panels"
-        anchors { top: missing.bottom; topMargin: 4; left: parent.left; right: parent.right; bottom: parent.bottom }
+        anchors { top: missing.visible ? missing.bottom : selector.bottom; topMargin: 4; left: parent.left; right: parent.right; bottom: parent.bottom }
         visible: page.chart !== null && !page.chart.empty
 
         Repeater {

@@ -9,8 +9,10 @@
 namespace pyx::qt {
 namespace {
 
-// A line breaks where its points stop for longer than this (or three slots, if longer).
+// A line breaks where its points stop for longer than this and than kGapSpacings times
+// its mean spacing in the window (so that a quantity reported seldom still draws a line).
 constexpr double kGapMs = 10'000;
+constexpr double kGapSpacings = 5;
 
 }  // namespace
 
@@ -124,9 +126,6 @@ void ChartModel::rebuild() {
     }
     missingText_ = missing.join(QStringLiteral(", "));
 
-    const double gapMs =
-        std::max(kGapMs, 3 * history_->limits().windowMs /
-                             static_cast<double>(history_->limits().pointsPerSeries));
     for (Panel& panel : panels_) {
         double low = INFINITY;
         double high = -INFINITY;
@@ -136,6 +135,15 @@ void ChartModel::rebuild() {
             panel.names << QString::fromStdString(s->label());
             QList<QPointF> line;
             const SeriesRing& ring = s->points();
+            std::size_t shown = 0;
+            double firstMs = 0;
+            for (std::size_t i = 0; i < ring.size(); ++i) {
+                if (ring.at(i).timeMs < fromMs_) continue;
+                if (shown++ == 0) firstMs = ring.at(i).timeMs;
+            }
+            const double spacing =
+                shown > 1 ? (ring.newest().timeMs - firstMs) / static_cast<double>(shown - 1) : 0;
+            const double gapMs = std::max(kGapMs, kGapSpacings * spacing);
             double previousMs = -INFINITY;
             for (std::size_t i = 0; i < ring.size(); ++i) {
                 const Bucket& b = ring.at(i);

@@ -13,6 +13,7 @@
 
 #include "../StoreFeed.h"
 #include "core/MainQueue.h"
+#include "metrics/history/History.h"
 #include "ui/FirstLevelViewController.h"
 #include "ui/SecondLevelViewController.h"
 #include "ui/ThirdLevelViewController.h"
@@ -225,6 +226,38 @@ TEST(ScreenshotPlan, CoversTheLaunchListEveryGroupAndEveryMenuPair) {
     EXPECT_EQ(Screenshots::fileName(1, {}), "01-launch.png");
     EXPECT_EQ(Screenshots::fileName(17, {"LTE", "C-DRX"}), "17-lte-c-drx.png");
     EXPECT_EQ(Screenshots::fileName(44, {"GSM", "GSM GPRS Config"}), "44-gsm-gsm-gprs-config.png");
+}
+
+TEST(ScreenshotPlan, ChartPagesAreNamedAfterTheirScreen) {
+    const auto charts = Screenshots::chartNumbers();
+    ASSERT_EQ(charts.size(), 11U);
+    EXPECT_EQ(charts.front(), 12);
+    EXPECT_EQ(Screenshots::fileName(12, {"LTE", "Serving Cell Meas"}, true),
+              "12-lte-serving-cell-meas-chart.png");
+}
+
+TEST_F(NavigatorTest, ScreensOfMeasuredQuantitiesOpenTheirChartWhenTheStoreKeepsAHistory) {
+    ASSERT_TRUE(navigator.open({"LTE", "Serving Cell Meas"}));
+    EXPECT_FALSE(navigator.current()->charted());  // no history kept
+    EXPECT_FALSE(navigator.openChart());
+
+    store->setHistory(std::make_shared<History>());
+    ASSERT_TRUE(navigator.open({"LTE", "Serving Cell Meas"}));
+    EXPECT_TRUE(navigator.current()->charted());
+    ASSERT_TRUE(navigator.openChart());
+    Screen* chart = navigator.current();
+    EXPECT_EQ(navigator.depth(), 4);
+    EXPECT_EQ(chart->title(), "LTE serving");
+    ASSERT_NE(chart->chart(), nullptr);
+    EXPECT_EQ(chart->model(), nullptr);
+    EXPECT_FALSE(chart->refreshes());
+    EXPECT_FALSE(chart->charted());
+    EXPECT_FALSE(navigator.select(0));
+    EXPECT_FALSE(navigator.openChart());
+    EXPECT_TRUE(chart->chart()->empty());
+
+    ASSERT_TRUE(navigator.open({"LTE", "C-DRX"}));
+    EXPECT_FALSE(navigator.current()->charted());
 }
 
 TEST(ScreenshotPlan, EveryPlannedScreenCanBeOpened) {
