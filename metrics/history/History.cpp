@@ -42,12 +42,17 @@ History::History() : History(Limits{}) {}
 History::History(Limits limits, Clock clock)
     : limits_(limits),
       clock_(clock ? std::move(clock) : Clock(systemClockMs)),
-      perQuantity_(historyQuantities().size(), 0) {
+      perQuantity_(historyQuantities().size(), 0),
+      single_(historyQuantities().size(), nullptr),
+      byProperty_(MetricValidator::kDictionaryPropertyCount) {
     if (limits_.pointsPerSeries == 0 || !(limits_.windowMs > 0) || limits_.seriesPerQuantity == 0)
         throw std::invalid_argument(
             "History: the window, the points per series and the series "
             "per quantity must be above zero");
     strongest_.reserve(64);
+    const auto quantities = historyQuantities();
+    for (std::size_t i = 0; i < quantities.size(); ++i)
+        byProperty_[static_cast<std::size_t>(quantities[i].property)].push_back(i);
 }
 
 bool History::feeds(Chart chart, MetricValidator::DictionaryProperty property) {
@@ -70,21 +75,15 @@ void History::startSession(double timeMs) {
 
 void History::record(MetricValidator::DictionaryProperty property, const Dict& stored,
                      std::optional<double> eventTimeMs) {
-    const auto quantities = historyQuantities();
+    const auto& read = byProperty_[static_cast<std::size_t>(property)];
+    if (read.empty()) return;
     const double timeMs = timeOf(eventTimeMs);
-    bool fed = false;
-    for (std::size_t i = 0; i < quantities.size(); ++i) {
-        if (quantities[i].property != property) continue;
-        if (!fed) {
-            fed = true;
-            ++revision_;
-            if (newestMs_ && timeMs + limits_.backwardsToleranceMs < *newestMs_)
-                startSession(timeMs);
-            else if (!newestMs_ || timeMs > *newestMs_)
-                newestMs_ = timeMs;
-        }
-        add(i, stored, timeMs);
-    }
+    ++revision_;
+    if (newestMs_ && timeMs + limits_.backwardsToleranceMs < *newestMs_)
+        startSession(timeMs);
+    else if (!newestMs_ || timeMs > *newestMs_)
+        newestMs_ = timeMs;
+    for (const std::size_t quantity : read) add(quantity, stored, timeMs);
 }
 
 void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
@@ -98,14 +97,14 @@ void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
                 holder = &nested->asDict();
             }
             if (const auto value = numberAt(*holder, q.field))
-                seriesFor(SeriesKey{quantity}).add(timeMs, *value);
+                singleFor(quantity).add(timeMs, *value);
             return;
         }
         case Pick::FirstEntry: {
             const Array* list = listAt(stored, q.container);
             if (list == nullptr || list->empty() || !list->front().isDict()) return;
             if (const auto value = numberAt(list->front().asDict(), q.field))
-                seriesFor(SeriesKey{quantity}).add(timeMs, *value);
+                singleFor(quantity).add(timeMs, *value);
             return;
         }
         case Pick::EachEntry: {
@@ -144,6 +143,12 @@ void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
 void History::addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs) {
     const Quantity& q = historyQuantities()[quantity];
     seriesFor(SeriesKey{quantity, keyAt(entry, q.keyA), keyAt(entry, q.keyB)}).add(timeMs, value);
+}
+
+Series& History::singleFor(std::size_t quantity) {
+    Series*& single = single_[quantity];
+    if (single == nullptr) single = &seriesFor(SeriesKey{quantity});
+    return *single;
 }
 
 Series& History::seriesFor(SeriesKey key) {

@@ -77,12 +77,16 @@ class History {
     void add(std::size_t quantity, const Dict& stored, double timeMs);
     void addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs);
     Series& seriesFor(SeriesKey key);
+    Series& singleFor(std::size_t quantity);
 
     Limits limits_;
     Clock clock_;
     std::vector<std::unique_ptr<Series>> series_;
     std::unordered_map<SeriesKey, Series*, KeyHash> index_;
-    std::vector<std::size_t> perQuantity_;                  // series made for each quantity
+    std::vector<std::size_t> perQuantity_;  // series made for each quantity
+    std::vector<Series*> single_;  // the one series of a quantity without entries, once made
+    // The quantities read from each kind, by property.
+    std::vector<std::vector<std::size_t>> byProperty_;
     std::vector<std::pair<float, const Dict*>> strongest_;  // scratch for the ranking
     std::optional<double> newestMs_;
     std::uint32_t session_ = 0;

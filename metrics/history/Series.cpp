@@ -33,7 +33,8 @@ void Series::describe() {
             break;
         case Pick::Strongest:
             if (q.keyB.empty())
-                std::snprintf(text, sizeof text, "%lld", static_cast<long long>(key_.a));
+                std::snprintf(text, sizeof text, "%.*s %lld", static_cast<int>(q.labelA.size()),
+                              q.labelA.data(), static_cast<long long>(key_.a));
             else
                 std::snprintf(text, sizeof text, "%lld/%lld", static_cast<long long>(key_.a),
                               static_cast<long long>(key_.b));

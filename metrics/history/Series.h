@@ -26,7 +26,8 @@ class Series {
 
     [[nodiscard]] const SeriesKey& key() const { return key_; }
     [[nodiscard]] const Quantity& quantity() const;
-    // The entity: "CC 1", "6300/118"; empty for a quantity of the serving cell.
+    // The entity: "CC 1", "ARFCN 58", "6300/118" (EARFCN/PCI); empty for a quantity of the
+    // serving cell.
     [[nodiscard]] const std::string& entity() const { return entity_; }
     // What a legend says: "RSRP avg", "CC 1 RSRQ", "6300/118".
     [[nodiscard]] std::string label() const;

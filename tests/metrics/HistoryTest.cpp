@@ -219,6 +219,17 @@ TEST(History, FeedsTellsWhichKindsAChartReads) {
     EXPECT_TRUE(History::feeds(Chart::GsmNeighbours, P::myGSMNbrMeasDict));
 }
 
+TEST(History, GsmNeighboursAreKeyedByTheirArfcn) {
+    History history;
+    Array list;
+    list.emplace_back(
+        entry({{"arfcn", Value(std::int64_t{58})}, {"rxlev", Value(std::int64_t{-82})}}));
+    history.record(P::myGSMNbrMeasDict, Dict{{"gsm_ncell_meas", Value(std::move(list))}}, kStart);
+    const auto series = history.seriesOf(Chart::GsmNeighbours, 0);
+    ASSERT_EQ(series.size(), 1U);
+    EXPECT_EQ(series[0]->label(), "ARFCN 58");
+}
+
 TEST(History, RefusesLimitsThatHoldNothing) {
     History::Limits limits;
     limits.pointsPerSeries = 0;

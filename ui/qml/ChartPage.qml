@@ -178,6 +178,13 @@ FocusScope {
                     objectName: "legend"
                     anchors { left: parent.left; right: parent.right; bottom: parent.bottom; leftMargin: 16; rightMargin: 8; bottomMargin: 6 }
                     spacing: 10
+                    Text {
+                        visible: text.length > 0
+                        text: page.chart ? page.chart.caption(panel.index) : ""
+                        font.pixelSize: 12
+                        font.weight: Font.DemiBold
+                        color: page.colors.text
+                    }
                     Repeater {
                         model: panel.names
                         delegate: Row {

@@ -60,6 +60,11 @@ QStringList ChartModel::seriesNames(int panel) const {
     return p ? p->names : QStringList();
 }
 
+QString ChartModel::caption(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->caption : QString();
+}
+
 double ChartModel::minimum(int panel) const {
     const Panel* p = panelAt(panel);
     return p ? p->minimum : 0;
@@ -122,7 +127,17 @@ void ChartModel::rebuild() {
         }
         const bool known = std::any_of(panels_.begin(), panels_.end(),
                                        [&](const Panel& p) { return p.unit == q.unit; });
-        if (!known) panels_.push_back(Panel{q.unit, {}, {}, {}, 0, 0});
+        if (!known) {
+            const bool pairs = q.pick == Pick::Strongest && !q.keyB.empty();
+            panels_.push_back(Panel{
+                q.unit,
+                {},
+                pairs ? QString::fromUtf8(q.labelA) + '/' + QString::fromUtf8(q.labelB) : QString(),
+                {},
+                {},
+                0,
+                0});
+        }
     }
     missingText_ = missing.join(QStringLiteral(", "));
 

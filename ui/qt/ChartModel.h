@@ -56,6 +56,8 @@ class ChartModel : public QObject {
     // The panel's unit ("dBm"), its lines' names, and the value range drawn.
     Q_INVOKABLE QString unit(int panel) const;
     Q_INVOKABLE QStringList seriesNames(int panel) const;
+    // What the names of a panel of neighbours are made of ("EARFCN/PCI"); empty otherwise.
+    Q_INVOKABLE QString caption(int panel) const;
     Q_INVOKABLE double minimum(int panel) const;
     Q_INVOKABLE double maximum(int panel) const;
     // A line is drawn as one or more segments: it breaks where its points stop for a while
@@ -81,6 +83,7 @@ class ChartModel : public QObject {
     struct Panel {
         Unit unit = Unit::Dbm;
         QStringList names;
+        QString caption;
         std::vector<QList<QPointF>> segments;
         std::vector<int> segmentLines;
         double minimum = 0;

@@ -88,6 +88,7 @@ TestCase {
         compare(chart.segmentLine(0, 0), 0)
         verify(chart.minimum(0) < -82 && chart.maximum(0) > -80)
         compare(chart.missingText, "")
+        compare(chart.caption(0), "")
         verify(findChild(page, "panel0") !== null)
         verify(findChild(page, "panel1") !== null)
     }
