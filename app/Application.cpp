@@ -102,7 +102,7 @@ int runPyxon(int argc, char** argv) {
         ->check(CLI::PositiveNumber)
         ->capture_default_str();
     cli.add_option("--screenshots", options.screenshots,
-                   "Render every screen to PNG files in this folder, then quit")
+                   "Render every screen and chart page to PNG files in this folder, then quit")
         ->type_name("DIR");
     cli.add_option("--chart", options.chart,
                    "Open the chart page of the screen GROUP/CATEGORY at start (window only)")
