@@ -7,7 +7,7 @@ namespace pyx::test {
 namespace {
 SecondLevelViewController screenOf(const std::shared_ptr<MetricValidator>& store,
                                    const std::string& group, const std::string& category) {
-    SecondLevelViewController screen(store);
+    SecondLevelViewController screen(*store);
     screen.setFirstSelection(group);
     screen.setSeguedThroughRow(category);
     return screen;
