@@ -135,16 +135,14 @@ struct ModemManagerBaseband::Shared {
     std::atomic<bool> wake{false};
 };
 
-namespace {
-
-// The polling thread's own state: the bus connection, the modem in use and what it said.
-class Poller {
+class ModemManagerBaseband::Poller {
   public:
-    Poller(const ModemManagerBaseband::Options& options, ModemManagerBaseband::Shared& shared,
-           velk::client::Transport::EventSink sink)
-        : options_(options), shared_(shared), sink_(std::move(sink)) {}
+    Poller(const ModemManagerBaseband::Options& options, ModemManagerBaseband::Shared& shared)
+        : options_(options), shared_(shared) {}
 
-    void run(const std::stop_token& stop) {
+    // Polls until stop, handing events to sink.
+    void run(const std::stop_token& stop, velk::client::Transport::EventSink sink) {
+        sink_ = std::move(sink);
         while (!stop.stop_requested()) {
             const milliseconds wait = cycle(stop);
             sleep(stop, wait);
@@ -579,8 +577,6 @@ class Poller {
     bool haveReading_ = false;
 };
 
-}  // namespace
-
 ModemManagerBaseband::ModemManagerBaseband(Options options)
     : options_(options), shared_(std::make_shared<Shared>()) {
     // sdbus-c++ keeps a process-wide bus for the messages inside variants, made on first use
@@ -677,11 +673,9 @@ velk::Result ModemManagerBaseband::performCommand(const std::string& command, co
 void ModemManagerBaseband::startEvents(EventSink sink) {
     const std::lock_guard control(controlMutex_);
     stopThread();
-    thread_ = std::jthread([options = options_, shared = shared_,
-                            sink = std::move(sink)](const std::stop_token& stop) {
-        Poller poller(options, *shared, sink);
-        poller.run(stop);
-    });
+    if (!poller_) poller_ = std::make_unique<Poller>(options_, *shared_);
+    thread_ = std::jthread([poller = poller_.get(), sink = std::move(sink)](
+                               const std::stop_token& stop) { poller->run(stop, sink); });
 }
 
 void ModemManagerBaseband::stopEvents() {

@@ -51,10 +51,16 @@ class ModemManagerBaseband : public velk::client::Transport {
     struct Shared;
 
   private:
+    // The polling thread's state (the bus connection, the modem in use, what it said and what
+    // the modem said); it outlives a stop and start of the events, so a restarted thread
+    // goes on where the last one stopped.
+    class Poller;
+
     void stopThread();
 
     const Options options_;
     std::shared_ptr<Shared> shared_;
+    std::unique_ptr<Poller> poller_;
     std::mutex controlMutex_;  // serialises starting and stopping the thread
     std::jthread thread_;
 };
