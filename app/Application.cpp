@@ -171,6 +171,8 @@ int runPyxon(int argc, char** argv) {
     status = runHeadless(root);
 #endif
     appDelegate.applicationWillTerminate();
+    // The source's thread stops here, before exit destroys the queues it posts events to.
+    transport->stopEvents();
     return status;
 }
 

@@ -107,6 +107,8 @@ int runListen(const ListenOptions& options) {
     }
     mainQueue.run();
     client->setDelegate({});
+    // The source's thread stops here, before exit destroys the queues it posts events to.
+    transport->stopEvents();
     return 0;
 }
 
