@@ -3,7 +3,9 @@
 // hand the transport factory to velk::client::SetTransportFactory.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <stdexcept>
@@ -39,6 +41,9 @@ struct SourceOptions {
     std::uint64_t seed = 1;  // sim
     double speed = 1.0;      // sim: time runs this much faster; replay: 0 = as fast as taken
     bool loop = false;       // replay: start again at the end
+    // replay: events handed out and not yet taken in by the store, so that a fast replay
+    // waits for it; none: the shared main queue's pending tasks.
+    std::function<std::size_t()> backlog;
 };
 
 // The transport of a source. Throws SourceSpecError for options that do not fit the source
@@ -48,5 +53,7 @@ struct SourceOptions {
 
 // The help text that explains the sources, with an example each; shared by pyxon and pyxonctl.
 [[nodiscard]] std::string_view sourceHelp();
+// The help text that explains --record and --append, with examples; shared likewise.
+[[nodiscard]] std::string_view recordingHelp();
 
 }  // namespace pyx::sources

@@ -1,7 +1,10 @@
 #include <charconv>
 #include <string>
 
+#include "core/MainQueue.h"
+#include "recordings/RecordingError.h"
 #include "sources/Source.h"
+#include "sources/replay/ReplayTransport.h"
 #include "sources/sim/SimulatedBaseband.h"
 
 namespace pyx::sources {
@@ -55,8 +58,20 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
             throw SourceSpecError("--source " + options.spec.text +
                                   ": this build has no ModemManager source");
         case SourceSpec::Kind::Replay:
-            throw SourceSpecError("--source " + options.spec.text +
-                                  ": this build has no replay source");
+            try {
+                replay::ReplayTransport::Options replayOptions;
+                replayOptions.file = options.spec.file;
+                replayOptions.speed = options.speed;
+                replayOptions.loop = options.loop;
+                replayOptions.backlog = options.backlog ? options.backlog : [] {
+                    return MainQueue::shared().pending();
+                };
+                return std::make_shared<replay::ReplayTransport>(std::move(replayOptions));
+            } catch (const recordings::RecordingError& e) {
+                throw SourceSpecError(std::string("--source replay: ") + e.what());
+            } catch (const std::invalid_argument& e) {
+                throw SourceSpecError(e.what());
+            }
     }
     throw SourceSpecError("--source " + options.spec.text + ": unknown source");
 }
@@ -69,8 +84,22 @@ std::string_view sourceHelp() {
            "                 example: --source modem\n"
            "  modem:N        the modem whose object path ends in /Modem/N\n"
            "                 example: --source modem:0\n"
-           "  replay:FILE    a recording made with --record; --speed and --loop apply\n"
+           "  replay:FILE    a recording made with --record; --speed (0 = as fast as the store\n"
+           "                 takes it) and --loop apply\n"
            "                 example: --source replay:drive.pyxrec --speed 10\n";
+}
+
+std::string_view recordingHelp() {
+    return "Recording (--record FILE, --append):\n"
+           "  every event that reaches the client goes, raw and in order, to FILE (an SQLite\n"
+           "  database, .pyxrec), written by a thread of its own and committed at least every\n"
+           "  second. An existing FILE is refused unless --append adds a new session to it.\n"
+           "  When writing fails (disk full, read-only folder, file removed) one line says so\n"
+           "  and the recording stops; everything else goes on.\n"
+           "  example: --record drive.pyxrec\n"
+           "  example: --source modem --record drive.pyxrec --append\n"
+           "  look at it later: pyxonctl info drive.pyxrec; pyxonctl export drive.pyxrec "
+           "--format csv\n";
 }
 
 }  // namespace pyx::sources
