@@ -38,6 +38,9 @@ RecordingReader::RecordingReader(std::string path) : path_(std::move(path)) {
                              "not a Pyxon recording (the file is empty)");
     try {
         db_ = std::make_unique<SqliteDatabase>(path_, SqliteDatabase::Mode::ReadOnly);
+        // A truncated file is shorter than its header says; SQLite refuses it outright unless
+        // told to go on, and this connection only reads, so the readable part is handed out.
+        db_->execute("PRAGMA writable_schema=ON");
         const long long application = db_->queryInteger("PRAGMA application_id");
         if (application != kApplicationID)
             throw RecordingError(Kind::NotARecording, path_,

@@ -1,8 +1,12 @@
 #include "recordings/RecordingWriter.h"
 
 #include <sqlite3.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
+#include <sys/statvfs.h>
 
+#include <algorithm>
+#include <cerrno>
 #include <condition_variable>
 #include <cstring>
 #include <deque>
@@ -44,8 +48,10 @@ struct Pending {
     Value object;
 };
 
-// What a failed write means to the user, in a few words.
-std::string whyWriteFailed(const SqliteError& error) {
+// What a failed write means to the user, in a few words. SQLite reports a failed write as an
+// I/O error without saying why, so the usual causes are looked at: the process's file-size
+// limit and the free space of the folder.
+std::string whyWriteFailed(const SqliteError& error, const std::string& path) {
     switch (error.primaryCode()) {
         case SQLITE_FULL:
             return "the disk is full";
@@ -53,11 +59,29 @@ std::string whyWriteFailed(const SqliteError& error) {
             return "the file or its folder is read-only";
         case SQLITE_CANTOPEN:
             return "the file or its folder cannot be written";
-        default:
+        case SQLITE_IOERR:
             break;
+        default:
+            return error.what();
     }
-    if (error.systemErrno() != 0) return std::strerror(error.systemErrno());
-    return error.what();
+    rlimit limit{};
+    if (::getrlimit(RLIMIT_FSIZE, &limit) == 0 && limit.rlim_cur != RLIM_INFINITY) {
+        std::error_code ignored;
+        const std::uintmax_t size = std::max(std::filesystem::file_size(path, ignored),
+                                             std::filesystem::file_size(path + "-wal", ignored));
+        if (size != static_cast<std::uintmax_t>(-1) && size + 65536 >= limit.rlim_cur)
+            return "the file reached the size limit";
+    }
+    const std::string folder = std::filesystem::path(path).parent_path().empty()
+                                   ? std::string(".")
+                                   : std::filesystem::path(path).parent_path().string();
+    struct statvfs space {};
+    if (::statvfs(folder.c_str(), &space) == 0 &&
+        static_cast<std::uintmax_t>(space.f_bavail) * space.f_frsize < 1024 * 1024)
+        return "the disk is full";
+    if (error.systemErrno() == EROFS || error.systemErrno() == EACCES)
+        return "the file or its folder is read-only";
+    return std::string("writing failed: ") + error.what();
 }
 
 struct FileIdentity {
@@ -195,7 +219,7 @@ struct RecordingWriter::State {
         try {
             db.emplace(open(sessionID, identity));
         } catch (const SqliteError& error) {
-            stop("cannot open it: " + whyWriteFailed(error));
+            stop("cannot open it: " + whyWriteFailed(error, options.path));
             return;
         }
         SqliteStatement insert = db->prepare(
@@ -276,7 +300,7 @@ struct RecordingWriter::State {
                     committed.notify_all();
                 }
             } catch (const SqliteError& error) {
-                stop(whyWriteFailed(error));
+                stop(whyWriteFailed(error, options.path));
                 return;
             }
             if (closeNow && !inTransaction) return;
