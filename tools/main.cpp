@@ -2,6 +2,7 @@
 #include <vector>
 
 #include "tools/DecodeCommand.h"
+#include "tools/ListenCommand.h"
 #ifdef PYXON_HAVE_SCREEN_COMMAND
 #include "tools/ScreenCommand.h"
 #endif
@@ -13,7 +14,8 @@ int main(int argc, char** argv) {
         "\"08fbb0def7d32b12040814101e\"}' | pyxonctl decode",
         "pyxonctl"};
     pyxonctl.require_subcommand(1);
-    std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl)};
+    std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl),
+                                             pyx::addListenCommand(pyxonctl)};
 #ifdef PYXON_HAVE_SCREEN_COMMAND
     subcommands.push_back(pyx::addScreenCommand(pyxonctl));
 #endif
