@@ -1,8 +1,12 @@
+#include <unistd.h>
+
 #include <charconv>
+#include <climits>
 #include <string>
 
 #include "core/MainQueue.h"
 #include "recordings/RecordingError.h"
+#include "recordings/RecordingTransport.h"
 #include "sources/Source.h"
 #include "sources/replay/ReplayTransport.h"
 #include "sources/sim/SimulatedBaseband.h"
@@ -63,6 +67,7 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
                 replayOptions.file = options.spec.file;
                 replayOptions.speed = options.speed;
                 replayOptions.loop = options.loop;
+                replayOptions.onEnd = options.onEnd;
                 replayOptions.backlog = options.backlog ? options.backlog : [] {
                     return MainQueue::shared().pending();
                 };
@@ -74,6 +79,28 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
             }
     }
     throw SourceSpecError("--source " + options.spec.text + ": unknown source");
+}
+
+RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
+                            const SourceOptions& options, const RecordOptions& record) {
+    recordings::RecordingWriter::Options writer;
+    writer.path = record.file;
+    writer.append = record.append;
+    writer.session.programVersion = record.programVersion;
+    writer.session.source = options.spec.text;
+    if (options.spec.kind == SourceSpec::Kind::Sim)
+        writer.session.seed = static_cast<std::int64_t>(options.seed);
+    if (options.spec.kind != SourceSpec::Kind::Modem) writer.session.speed = options.speed;
+    char host[HOST_NAME_MAX + 1] = {};
+    if (gethostname(host, sizeof host - 1) == 0) writer.session.host = host;
+    try {
+        auto recording = std::make_shared<recordings::RecordingWriter>(std::move(writer));
+        auto transport =
+            std::make_shared<recordings::RecordingTransport>(std::move(source), recording);
+        return RecordedSource{std::move(transport), std::move(recording)};
+    } catch (const recordings::RecordingError& e) {
+        throw SourceSpecError(std::string("--record ") + e.what());
+    }
 }
 
 std::string_view sourceHelp() {

@@ -25,8 +25,8 @@ double checkedSpeed(double speed) {
 }  // namespace
 
 ReplayTransport::ReplayTransport(Options options)
-    : options_{std::move(options.file), checkedSpeed(options.speed), options.loop,
-               std::move(options.backlog), options.maxBacklog},
+    : options_{std::move(options.file),    checkedSpeed(options.speed), options.loop,
+               std::move(options.backlog), options.maxBacklog,          std::move(options.onEnd)},
       reader_(options_.file) {}
 
 ReplayTransport::~ReplayTransport() {
@@ -173,6 +173,7 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
             if (options_.loop)
                 systemLog(
                     format("replay %s: the recording holds no events", options_.file.c_str()));
+            if (say && options_.onEnd) options_.onEnd();
             return;
         }
     }

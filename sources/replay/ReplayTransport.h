@@ -34,6 +34,8 @@ class ReplayTransport : public velk::client::Transport {
         // Events handed out and not yet taken by the store; none: no limit.
         std::function<std::size_t()> backlog;
         std::size_t maxBacklog = 64;
+        // Called once, on the replay's thread, after the last event without loop.
+        std::function<void()> onEnd;
     };
 
     // Opens and checks the file; throws recordings::RecordingError (one line naming the file)
