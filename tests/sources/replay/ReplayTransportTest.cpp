@@ -293,12 +293,14 @@ TEST(Replay, EventsFlowOnceAConfigurationIsPushedAndARestartGoesOnWhereItWas) {
     const pyx::CapturedLines log(pyx::systemLogSink());
     const TempDir dir;
     const std::string file = dir.file("drive.pyxrec");
-    writeSamples(file, 40, std::chrono::milliseconds(0));
+    writeSamples(file, 40);
     ReplayTransport::Options options;
     options.file = file;
     options.speed = 0;
-    std::atomic<bool> hold{false};
-    options.backlog = [&] { return hold ? std::size_t{1000} : std::size_t{0}; };
+    // The store "takes" the first ten events, then nothing until let go.
+    std::atomic<std::size_t> handed{0};
+    std::atomic<std::size_t> room{10};
+    options.backlog = [&] { return handed >= room ? std::size_t{1000} : std::size_t{0}; };
     ReplayTransport replay(options);
 
     Collector before;
@@ -310,19 +312,24 @@ TEST(Replay, EventsFlowOnceAConfigurationIsPushedAndARestartGoesOnWhereItWas) {
         replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr).code,
         velk::kCodeSuccess);
     Collector first;
-    replay.startEvents(first.sink());
-    ASSERT_TRUE(first.waitForCount(1));
-    hold = true;
+    const auto firstSink = first.sink();
+    replay.startEvents([&](const std::string& stream, Value object) {
+        ++handed;
+        firstSink(stream, std::move(object));
+    });
+    ASSERT_TRUE(first.waitForCount(10));
+    std::this_thread::sleep_for(std::chrono::milliseconds(20));
     replay.stopEvents();
-    const auto firstEvents = first.events();
-    hold = false;
+    ASSERT_EQ(first.events().size(), 10u);
+
+    room = 1000;
     Collector second;
     replay.startEvents(second.sink());
     ASSERT_TRUE(waitUntil([&] { return replay.finished(); }));
     const auto secondEvents = second.events();
-    ASSERT_EQ(firstEvents.size() + secondEvents.size(), 40u);
-    EXPECT_EQ(sequenceOf(secondEvents.front().object),
-              static_cast<std::int64_t>(firstEvents.size()));
+    ASSERT_EQ(secondEvents.size(), 30u);
+    for (std::size_t i = 0; i < secondEvents.size(); ++i)
+        EXPECT_EQ(sequenceOf(secondEvents[i].object), static_cast<std::int64_t>(10 + i));
 }
 
 std::string refusal(const std::string& spec, double speed = 1.0) {
