@@ -81,7 +81,7 @@ bool ReplayTransport::waitForRoom(const std::stop_token& stop) {
     if (!options_.backlog) return !stop.stop_requested();
     while (options_.backlog() > options_.maxBacklog) {
         std::unique_lock lock(waitMutex_);
-        if (wake_.wait_for(lock, stop, std::chrono::milliseconds(1), [] { return false; }) ||
+        if (wake_.wait_for(lock, stop, std::chrono::microseconds(200), [] { return false; }) ||
             stop.stop_requested())
             return false;
     }

@@ -33,7 +33,7 @@ class ReplayTransport : public velk::client::Transport {
         bool loop = false;
         // Events handed out and not yet taken by the store; none: no limit.
         std::function<std::size_t()> backlog;
-        std::size_t maxBacklog = 64;
+        std::size_t maxBacklog = 1024;
         // Called once, on the replay's thread, after the last event without loop.
         std::function<void()> onEnd;
     };
