@@ -15,6 +15,7 @@
 #include "metrics/MetricValidator.h"
 #include "recordings/RecordingError.h"
 #include "recordings/RecordingReader.h"
+#include "tools/CsvText.h"
 #include "tools/DecodeCommand.h"
 #include "tools/IsoTime.h"
 
@@ -160,27 +161,6 @@ std::string cellText(const Value& value) {
         default:
             return value.description();
     }
-}
-
-void appendCsvField(std::string& out, std::string_view field) {
-    if (field.find_first_of(",\"\r\n") == std::string_view::npos) {
-        out += field;
-        return;
-    }
-    out += '"';
-    for (const char c : field) {
-        if (c == '"') out += '"';
-        out += c;
-    }
-    out += '"';
-}
-
-void appendCsvRow(std::string& out, const std::vector<std::string>& cells) {
-    for (std::size_t i = 0; i < cells.size(); ++i) {
-        if (i > 0) out += ',';
-        appendCsvField(out, cells[i]);
-    }
-    out += "\r\n";
 }
 
 MetricRecord recordOf(const RecordedEvent& event) {

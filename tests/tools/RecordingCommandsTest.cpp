@@ -19,6 +19,7 @@
 #include "sources/sim/SimulatedBaseband.h"
 #include "tests/recordings/SampleEvents.h"
 #include "tests/recordings/TempDir.h"
+#include "tools/CsvText.h"
 #include "tools/ExportCommand.h"
 #include "tools/InfoCommand.h"
 #include "tools/IsoTime.h"
@@ -169,6 +170,14 @@ TEST(IsoTime, TimesAreWrittenInUtcWithNanosecondsAndReadBackInTheFormsGiven) {
     EXPECT_FALSE(pyx::parseIsoTime("yesterday"));
     EXPECT_FALSE(pyx::parseIsoTime("2026-13-01"));
     EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21:18Zjunk"));
+}
+
+TEST(CsvText, FieldsWithCommasQuotesOrLineBreaksAreQuotedAsRfc4180Has) {
+    std::string row;
+    pyx::appendCsvRow(row, {"plain", "a,b", "say \"hi\"", "two\nlines", "", "-107"});
+    EXPECT_EQ(row, "plain,\"a,b\",\"say \"\"hi\"\"\",\"two\nlines\",,-107\r\n");
+    EXPECT_EQ(csvRows(row), (std::vector<std::vector<std::string>>{
+                                {"plain", "a,b", "say \"hi\"", "two\nlines", "", "-107"}}));
 }
 
 TEST(InfoCommand, SaysHowManyEventsOfWhichKindsWhenAndFromWhichSessions) {
