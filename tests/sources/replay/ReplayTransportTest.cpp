@@ -300,6 +300,7 @@ TEST(Replay, EventsFlowOnceAConfigurationIsPushedAndARestartGoesOnWhereItWas) {
     // The store "takes" the first ten events, then nothing until let go.
     std::atomic<std::size_t> handed{0};
     std::atomic<std::size_t> room{10};
+    options.maxBacklog = 4;
     options.backlog = [&] { return handed >= room ? std::size_t{1000} : std::size_t{0}; };
     ReplayTransport replay(options);
 
