@@ -166,7 +166,8 @@ struct RecordingWriter::State {
         const bool fresh = !std::filesystem::exists(options.path);
         SqliteDatabase db(options.path, fresh ? SqliteDatabase::Mode::ReadWriteCreate
                                               : SqliteDatabase::Mode::ReadWrite);
-        db.execute("PRAGMA journal_mode=WAL; PRAGMA synchronous=NORMAL;");
+        db.execute(
+            "PRAGMA journal_mode=WAL; PRAGMA synchronous=NORMAL; PRAGMA wal_autocheckpoint=4000;");
         if (fresh) {
             db.execute("BEGIN");
             db.execute(format("PRAGMA application_id=%d; PRAGMA user_version=%d;", kApplicationID,

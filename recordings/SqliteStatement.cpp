@@ -35,7 +35,7 @@ void SqliteStatement::bind(int index, double value) {
 
 void SqliteStatement::bind(int index, std::string_view text) {
     check(*database_, sqlite3_bind_text64(statement_.get(), index, text.data(), text.size(),
-                                          SQLITE_TRANSIENT, SQLITE_UTF8));
+                                          SQLITE_STATIC, SQLITE_UTF8));
 }
 
 void SqliteStatement::bindBlob(int index, std::span<const std::uint8_t> bytes) {
@@ -43,7 +43,7 @@ void SqliteStatement::bindBlob(int index, std::span<const std::uint8_t> bytes) {
     static const std::uint8_t kNothing = 0;
     check(*database_,
           sqlite3_bind_blob64(statement_.get(), index, bytes.empty() ? &kNothing : bytes.data(),
-                              bytes.size(), SQLITE_TRANSIENT));
+                              bytes.size(), SQLITE_STATIC));
 }
 
 bool SqliteStatement::step() {
@@ -55,7 +55,6 @@ bool SqliteStatement::step() {
 
 void SqliteStatement::reset() {
     sqlite3_reset(statement_.get());
-    sqlite3_clear_bindings(statement_.get());
 }
 
 bool SqliteStatement::isNull(int column) const {

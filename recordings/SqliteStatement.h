@@ -20,7 +20,8 @@ class SqliteStatement {
   public:
     SqliteStatement(const SqliteDatabase& database, sqlite3_stmt* statement);
 
-    // Parameters count from 1, as in SQLite.
+    // Parameters count from 1, as in SQLite. Texts and blobs are not copied: they must stay
+    // as they are until the statement has run (step) or is bound anew.
     void bindNull(int index);
     void bind(int index, std::int64_t value);
     void bind(int index, double value);
@@ -29,7 +30,7 @@ class SqliteStatement {
 
     // Runs to the next row: true when there is one, false when done. Throws SqliteError.
     bool step();
-    // Ready to run again with new parameters.
+    // Ready to run again; the parameters keep their values until bound anew.
     void reset();
 
     [[nodiscard]] bool isNull(int column) const;
