@@ -2,13 +2,11 @@
 
 #include <CLI/CLI.hpp>
 
-#include <atomic>
 #include <csignal>
 #include <cstdint>
 #include <iostream>
 #include <optional>
 #include <string>
-#include <thread>
 
 #include "app/AppDelegate.h"
 #include "app/RejectedRecords.h"
@@ -20,8 +18,10 @@
 #include "core/Log.h"
 #include "core/MainQueue.h"
 #include "metrics/MetricValidator.h"
+#include "metrics/history/History.h"
 #include "sources/Source.h"
 #ifdef PYXON_HAVE_WINDOW
+#include "ui/ChartScreens.h"
 #include "ui/qt/QtFrontEnd.h"
 #endif
 
@@ -37,7 +37,12 @@ struct Options {
     std::optional<std::string> record;
     bool append = false;
     std::optional<std::string> screenshots;
+    std::optional<std::string> chart;
 };
+
+// Screenshots are taken after this much simulated time per second, unless --speed says
+// otherwise, so that the charts have long lines.
+constexpr double kScreenshotSpeed = 30;
 
 int runHeadless(RootNavigationController& root) {
     MainQueue& mainQueue = MainQueue::shared();
@@ -79,15 +84,21 @@ int runPyxon(int argc, char** argv) {
                  "With --record: add a new session to an existing recording")
         ->needs(record);
     cli.add_option("--screenshots", options.screenshots,
-                   "Render every screen to PNG files in this folder, then quit")
+                   "Render every screen and chart page to PNG files in this folder, then quit")
         ->type_name("DIR");
+    cli.add_option("--chart", options.chart,
+                   "Open the chart page of the screen GROUP/CATEGORY at start (window only)")
+        ->type_name("GROUP/CATEGORY");
     cli.set_version_flag("--version", std::string("pyxon ") + PYXON_VERSION);
     cli.footer(std::string(sources::sourceHelp()) + "\n" + std::string(sources::recordingHelp()) +
                "\nExamples:\n"
                "  pyxon --headless --speed 20\n"
                "  pyxon --source modem\n"
                "  pyxon --source modem --record drive.pyxrec\n"
-               "  pyxon --source replay:drive.pyxrec --speed 4 --loop\n");
+               "  pyxon --source replay:drive.pyxrec --speed 4 --loop\n"
+               "  pyxon --chart 'LTE/Serving Cell Meas'\n"
+               "  pyxon --screenshots shots   (simulated time runs 30 times faster unless "
+               "--speed is given)\n");
     try {
         cli.parse(argc, argv);
     } catch (const CLI::CallForHelp& e) {
@@ -117,6 +128,25 @@ int runPyxon(int argc, char** argv) {
         std::cerr << "pyxon: --screenshots needs the window\n";
         return 2;
     }
+    std::optional<std::pair<std::string, std::string>> chart;
+    if (options.chart) {
+        const auto slash = options.chart->find('/');
+        if (slash != std::string::npos)
+            chart.emplace(options.chart->substr(0, slash), options.chart->substr(slash + 1));
+#ifdef PYXON_HAVE_WINDOW
+        if (!chart || !chartForCategory(chart->first + " " + chart->second)) {
+            std::cerr << "pyxon: --chart: \"" << *options.chart
+                      << "\" is not a screen with a chart (e.g. \"LTE/Serving Cell Meas\")\n";
+            return 2;
+        }
+#endif
+        if (!window) {
+            std::cerr << "pyxon: --chart needs the window\n";
+            return 2;
+        }
+    }
+    if (options.screenshots && cli.get_option("--speed")->count() == 0)
+        options.speed = kScreenshotSpeed;
 
     std::optional<StopOnSignal> stopOnSignal;
     if (!window) stopOnSignal.emplace(MainQueue::shared());
@@ -155,12 +185,15 @@ int runPyxon(int argc, char** argv) {
     // Creation order: the client's shared instance, then the store's (which listens and then
     // becomes the delegate), then the start-up sequence once the root view has loaded.
     RootNavigationController root;
+    // The charts' history, fed by the store on every stored arrival.
+    root.myMetricValidator->setHistory(std::make_shared<History>());
 
     int status = 0;
 #ifdef PYXON_HAVE_WINDOW
     if (window) {
         WindowOptions windowOptions;
         windowOptions.screenshotDir = options.screenshots;
+        windowOptions.chart = chart;
         status = runWindow(argc, argv, windowOptions, [&root] { root.viewDidLoad(); });
     } else {
         status = runHeadless(root);

@@ -7,6 +7,7 @@
 #include "core/Log.h"
 #include "metrics/MetricCatalogue.h"
 #include "metrics/TimestampText.h"
+#include "metrics/history/History.h"
 
 namespace pyx {
 
@@ -147,6 +148,7 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     update.commit();
 
     const auto& now = self.dictionary(property);
+    if (self.history_ && now) self.history_->record(property, *now, milliseconds);
     std::string& line = self.arrivalLine_;
     line.assign(kind->logPrefix);
     if (now) appendDescription(line, *now);
