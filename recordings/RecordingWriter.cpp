@@ -122,7 +122,9 @@ struct RecordingWriter::State {
         bool sayDropped = false;
         {
             const std::lock_guard lock(mutex);
-            if (stopped || closing) {
+            // After close the recording is over: what still arrives is no loss.
+            if (closing) return;
+            if (stopped) {
                 ++counts.dropped;
                 return;
             }

@@ -36,7 +36,7 @@ class RecordingWriter {
 
     struct Counts {
         std::uint64_t recorded = 0;  // committed to the file
-        std::uint64_t dropped = 0;   // lost to a full queue or after the recording stopped
+        std::uint64_t dropped = 0;   // lost to a full queue or after a write failed
         bool stopped = false;        // a write failed: nothing more is written
     };
 
