@@ -7,6 +7,7 @@
 #include <chrono>
 #include <condition_variable>
 #include <deque>
+#include <filesystem>
 #include <fstream>
 #include <mutex>
 #include <stdexcept>
@@ -331,6 +332,34 @@ TEST(Replay, EventsFlowOnceAConfigurationIsPushedAndARestartGoesOnWhereItWas) {
     ASSERT_EQ(secondEvents.size(), 30u);
     for (std::size_t i = 0; i < secondEvents.size(); ++i)
         EXPECT_EQ(sequenceOf(secondEvents[i].object), static_cast<std::int64_t>(10 + i));
+}
+
+TEST(Replay, ADamagedRecordingPlaysWhatCanBeReadThenSaysWhereItBrokeOff) {
+    const TempDir dir;
+    const std::string file = dir.file("cut.pyxrec");
+    {
+        RecordingWriter writer(writerOptions(file));
+        for (int n = 0; n < 3000; ++n) writer.add(velk::kEventMetric, sampleEvent(n, 40));
+    }
+    std::filesystem::resize_file(file, std::filesystem::file_size(file) / 2);
+    const pyx::CapturedLines log(pyx::systemLogSink());
+    ReplayTransport::Options options;
+    options.file = file;
+    options.speed = 0;
+    ReplayTransport replay(options);
+    replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+    Collector collector;
+    replay.startEvents(collector.sink());
+    ASSERT_TRUE(waitUntil([&] { return replay.finished(); }));
+    const auto events = collector.events();
+    ASSERT_GT(events.size(), 500u);
+    ASSERT_LT(events.size(), 3000u);
+    for (std::size_t i = 0; i < events.size(); ++i)
+        ASSERT_EQ(sequenceOf(events[i].object), static_cast<std::int64_t>(i));
+    const auto lines = log.lines();
+    ASSERT_EQ(lines.size(), 1u);
+    EXPECT_EQ(lines[0].rfind("replay " + file + ": damaged after event ", 0), 0u) << lines[0];
+    EXPECT_TRUE(lines[0].ends_with("; the replay stops here")) << lines[0];
 }
 
 std::string refusal(const std::string& spec, double speed = 1.0) {
