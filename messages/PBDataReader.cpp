@@ -23,19 +23,6 @@ std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std:
     return 0;
 }
 
-std::optional<std::span<const std::uint8_t>> PBDataReader::readDelimited() {
-    const std::size_t start = pos_;
-    const std::uint64_t size = readVarint();
-    if (error_) return std::nullopt;
-    if (size > remaining()) {
-        fail(Reason::LengthPastEnd, start);
-        return std::nullopt;
-    }
-    const std::span<const std::uint8_t> value(bytes_ + pos_, static_cast<std::size_t>(size));
-    pos_ += value.size();
-    return value;
-}
-
 namespace {
 
 bool validUtf8(const std::uint8_t* p, std::size_t n) {

@@ -49,7 +49,7 @@ class PBDataReader {
 
     // A length-delimited value: its length, then that many bytes, which are passed over.
     // Nothing, with the failure recorded, when the length cannot be read or runs past the end.
-    std::optional<std::span<const std::uint8_t>> readDelimited();
+    inline std::optional<std::span<const std::uint8_t>> readDelimited();
 
     // A reader over bytes this reader holds (a value from readDelimited): a nested record or a
     // packed list is read by a reader of its own, whose failures keep the payload's offsets.
@@ -103,6 +103,19 @@ inline std::uint64_t PBDataReader::readVarint() {
     bool truncated = false;
     const std::uint64_t value = decodeVarint(bytes_, pos_, length_, truncated);
     if (truncated) fail(DecodeError::Reason::TruncatedVarint, pos_);
+    return value;
+}
+
+inline std::optional<std::span<const std::uint8_t>> PBDataReader::readDelimited() {
+    const std::size_t start = pos_;
+    const std::uint64_t size = readVarint();
+    if (error_) return std::nullopt;
+    if (size > remaining()) {
+        fail(DecodeError::Reason::LengthPastEnd, start);
+        return std::nullopt;
+    }
+    const std::span<const std::uint8_t> value(bytes_ + pos_, static_cast<std::size_t>(size));
+    pos_ += value.size();
     return value;
 }
 
