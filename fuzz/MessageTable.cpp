@@ -26,7 +26,7 @@ void check(std::span<const std::uint8_t> payload) {
     M first;
     const bool read = first.readFrom(reader);
     if (read == reader.hasError()) broken(name, "a refusal does not say why, or a read does");
-    if (!read && reader.error()->offset() >= payload.size()) {
+    if (!read && reader.error()->offset() > payload.size()) {
         broken(name, "a refusal points past the payload");
     }
     const Dict shown = first.dictionaryRepresentation();

@@ -33,6 +33,12 @@ TEST(DecodeError, TruncatedVarintInAValueIsReportedAtItsFirstByte) {
               DecodeError(Reason::TruncatedVarint, 3));
 }
 
+TEST(DecodeError, ValueMissingAfterTheLastKeyIsReportedAtTheEnd) {
+    EXPECT_EQ(failureOf<KCellularLteRrcState>(bytes({0x08, 0x05, 0x10})),
+              DecodeError(Reason::TruncatedVarint, 3));
+    EXPECT_EQ(failureOf<KCellularLteRrcState>(key(20, 1)), DecodeError(Reason::TruncatedFixed, 2));
+}
+
 TEST(DecodeError, TruncatedVarintInAKeyIsReportedAtItsFirstByte) {
     EXPECT_EQ(failureOf<KCellularLteRrcState>(bytes({0x08, 0x05, 0x80})),
               DecodeError(Reason::TruncatedVarint, 2));
