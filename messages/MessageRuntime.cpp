@@ -128,8 +128,9 @@ void readNested(const SubMessageOps& ops, void* nested, PBDataReader& reader) {
 // Every field that is not a plain scalar, on the reader: the length-delimited kinds and the
 // repeated scalars. A failure is left in the reader. Kept out of the reader loop, whose plain
 // scalars are the common case.
-[[gnu::noinline]] void readObjectField(void* message, const FieldDescriptor& f, std::uint8_t wireType,
-                     std::uint64_t& has, PBDataReader& reader) {
+[[gnu::noinline]] void readObjectField(void* message, const FieldDescriptor& f,
+                                       std::uint8_t wireType, std::uint64_t& has,
+                                       PBDataReader& reader) {
     switch (f.kind) {
         case FieldKind::Data:
             at<std::optional<Bytes>>(message, f) = PBReaderReadData(reader);
