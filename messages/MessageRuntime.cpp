@@ -87,19 +87,23 @@ void readPackedValues(List& list, PBDataReader& packed, Convert convert) {
     const std::size_t limit = packed.length();
     std::size_t pos = packed.position();
     bool error = false;
-    // Each value takes at least one byte: the record's length bounds the count.
-    list.reserve(list.size() + (limit - pos));
-    while (pos < limit && !error) list.push_back(convert(decodeVarint(bytes, pos, limit, error)));
+    // Each value takes at least one byte: the record's length bounds the count. The values are
+    // written through a pointer into room made up front, and the list cut to what was read.
+    const std::size_t before = list.size();
+    list.resize(before + (limit - pos));
+    auto* out = list.data() + before;
+    while (pos < limit && !error) *out++ = convert(decodeVarint(bytes, pos, limit, error));
+    list.resize(static_cast<std::size_t>(out - list.data()));
     packed.setPosition(pos);
     if (error) packed.fail(DecodeError::Reason::TruncatedVarint, pos);
 }
 
-constexpr std::uint32_t asUInt32(std::uint64_t v) {
-    return static_cast<std::uint32_t>(v);
-}
-constexpr std::int32_t asSInt32(std::uint64_t v) {
+// The value of a list element from its varint (function objects, so that the packed loop
+// inlines them).
+constexpr auto asUInt32 = [](std::uint64_t v) { return static_cast<std::uint32_t>(v); };
+constexpr auto asSInt32 = [](std::uint64_t v) {
     return decodeZigZag32(static_cast<std::uint32_t>(v));
-}
+};
 
 // A repeated scalar: a packed list when it comes length-delimited, otherwise one value.
 template <class List, class Convert>
