@@ -106,9 +106,11 @@ Subcommand addDecodeCommand(CLI::App& pyxonctl) {
         "\"pusch_tx_power\":15}]}}\n"
         "A metric the store does not care for gives {\"metric\":\"0x3CD301\",\"ignored\":true};\n"
         "a refused record or a line that is not a record gives\n"
-        "{\"metric\":\"0x3CD302\" or null,\"error\":\"what was wrong\"}. The store's own log "
-        "lines\n"
-        "go to stderr. The exit code is 0 once all input is read.\n");
+        "{\"metric\":\"0x3CD302\" or null,\"error\":\"what was wrong\"}; a payload that does not\n"
+        "decode says why and at which byte, e.g. for the payload \"08ff\"\n"
+        "  {\"metric\":\"0x3CD302\",\"error\":\"the payload does not decode as "
+        "KCellularLteTxPower: truncated varint at byte 1\"}\n"
+        "The store's own log lines go to stderr. The exit code is 0 once all input is read.\n");
     return Subcommand{decode, [] {
                           standardOutputSink().redirect(stderr);
                           return runDecode(std::cin, std::cout);
