@@ -103,8 +103,8 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     }
     DecodeResult decoded = kind->decode(payload->asBytes());
     if (const auto* error = std::get_if<DecodeError>(&decoded)) {
-        throw MetricRejected(id, "the payload does not decode as " +
-                                     std::string(kind->messageClass) + ": " + error->text());
+        throw MetricRejected(
+            id, "does not decode as " + std::string(kind->messageClass) + ": " + error->text());
     }
     std::optional<Dict> stored = std::move(std::get<Dict>(decoded));
 

@@ -108,7 +108,7 @@ Subcommand addDecodeCommand(CLI::App& pyxonctl) {
         "a refused record or a line that is not a record gives\n"
         "{\"metric\":\"0x3CD302\" or null,\"error\":\"what was wrong\"}; a payload that does not\n"
         "decode says why and at which byte, e.g. for the payload \"08ff\"\n"
-        "  {\"metric\":\"0x3CD302\",\"error\":\"the payload does not decode as "
+        "  {\"metric\":\"0x3CD302\",\"error\":\"does not decode as "
         "KCellularLteTxPower: truncated varint at byte 1\"}\n"
         "The store's own log lines go to stderr. The exit code is 0 once all input is read.\n");
     return Subcommand{decode, [] {

@@ -52,6 +52,6 @@ TEST(RejectedRecords, UndecodablePayloadLineSaysWhyAndAtWhichByte) {
         queue.drain();
     }
     EXPECT_TRUE(
-        log.contains("pyxon: rejected metric record 0x3C4E04: the payload does not decode as "
+        log.contains("pyxon: rejected metric record 0x3C4E04: does not decode as "
                      "KCellularLteRrcState: truncated varint at byte 12"));
 }

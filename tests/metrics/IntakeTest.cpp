@@ -209,7 +209,7 @@ TEST_F(Intake, RejectionNamesTheMetricIDAndReason) {
     } catch (const MetricRejected& rejection) {
         EXPECT_EQ(rejection.metricID(), std::int64_t{3986178});
         EXPECT_EQ(std::string(rejection.what()),
-                  "metric 0x3CD302: the payload does not decode as KCellularLteTxPower: "
+                  "metric 0x3CD302: does not decode as KCellularLteTxPower: "
                   "truncated varint at byte 1");
     }
 }
@@ -223,7 +223,7 @@ const Bytes kRrcStateCutAtByte12 = {0x08, 0xFB, 0xB0, 0xDE, 0xF7, 0xD3, 0x2B,
 TEST_F(Intake, TruncatedVarintIsRejectedWithItsByte) {
     expectRejectedWithoutChange(
         metricRecord(3952132, kRrcStateCutAtByte12),
-        "the payload does not decode as KCellularLteRrcState: truncated varint at byte 12");
+        "does not decode as KCellularLteRrcState: truncated varint at byte 12");
 }
 
 TEST_F(Intake, RejectionLineOfAnUndecodablePayloadSaysWhyAndWhere) {
@@ -232,7 +232,7 @@ TEST_F(Intake, RejectionLineOfAnUndecodablePayloadSaysWhyAndWhere) {
         FAIL() << "the record was taken";
     } catch (const MetricRejected& rejection) {
         EXPECT_EQ(std::string(rejection.what()),
-                  "metric 0x3C4E04: the payload does not decode as KCellularLteRrcState: "
+                  "metric 0x3C4E04: does not decode as KCellularLteRrcState: "
                   "truncated varint at byte 12");
     }
 }
@@ -248,34 +248,34 @@ TEST_F(Intake, LengthPastTheEndIsRejectedWithItsByte) {
     // tx_power_info of 5 bytes with 2 present.
     expectRejectedWithoutChange(
         metricRecord(3986178, Bytes{0x08, 0x01, 0x12, 0x05, 0x08, 0x0A}),
-        "the payload does not decode as KCellularLteTxPower: length past the end at byte 3");
+        "does not decode as KCellularLteTxPower: length past the end at byte 3");
 }
 
 TEST_F(Intake, TruncatedFixedWidthValueIsRejectedWithItsByte) {
     // Unknown field 20 as fixed64 with three bytes.
     expectRejectedWithoutChange(
         metricRecord(3986178, Bytes{0x08, 0x01, 0xA1, 0x01, 0x01, 0x02, 0x03}),
-        "the payload does not decode as KCellularLteTxPower: truncated fixed-width value at "
+        "does not decode as KCellularLteTxPower: truncated fixed-width value at "
         "byte 4");
 }
 
 TEST_F(Intake, UnknownWireTypeIsRejectedWithItsByte) {
     expectRejectedWithoutChange(
         metricRecord(3986178, Bytes{0x08, 0x01, 0x4F}),
-        "the payload does not decode as KCellularLteTxPower: unknown wire type at byte 2");
+        "does not decode as KCellularLteTxPower: unknown wire type at byte 2");
 }
 
 TEST_F(Intake, MismatchedEndOfGroupIsRejectedWithItsByte) {
     // Group 23 closed by field 24's end key.
     expectRejectedWithoutChange(metricRecord(3986178, Bytes{0x08, 0x01, 0xBB, 0x01, 0xC4, 0x01}),
-                                "the payload does not decode as KCellularLteTxPower: end of group "
+                                "does not decode as KCellularLteTxPower: end of group "
                                 "does not match its start at byte 4");
 }
 
 TEST_F(Intake, GroupWithoutItsEndIsRejectedWithItsByte) {
     expectRejectedWithoutChange(
         metricRecord(3986178, Bytes{0x08, 0x01, 0xBB, 0x01, 0x08, 0x02}),
-        "the payload does not decode as KCellularLteTxPower: group without its end at byte 2");
+        "does not decode as KCellularLteTxPower: group without its end at byte 2");
 }
 
 TEST_F(Intake, MetricIDIsTheLastProcessedEvenWhenRejected) {

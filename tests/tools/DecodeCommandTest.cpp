@@ -48,7 +48,7 @@ TEST_F(Decode, NotCaredForMetricIsIgnored) {
 TEST_F(Decode, RejectedRecordGivesTheMetricAndTheReason) {
     EXPECT_EQ(decoded(R"({"kKeyMetricID": 3986178, "kKeyPayload": "08ff"})"),
               Json::parse(R"({"metric":"0x3CD302",
-                              "error":"the payload does not decode as KCellularLteTxPower: truncated varint at byte 1"})"));
+                              "error":"does not decode as KCellularLteTxPower: truncated varint at byte 1"})"));
 }
 
 // The "error" of a payload that does not decode: the class, the reason and the byte.
@@ -64,35 +64,34 @@ class DecodeRefusal : public Decode {
 
 TEST_F(DecodeRefusal, TruncatedVarint) {
     EXPECT_EQ(errorOf(3952132, "08fbb0def7d32b100318012085"),
-              "the payload does not decode as KCellularLteRrcState: truncated varint at byte 12");
+              "does not decode as KCellularLteRrcState: truncated varint at byte 12");
 }
 
 TEST_F(DecodeRefusal, LengthPastTheEnd) {
     EXPECT_EQ(errorOf(3986178, "08011205080a"),
-              "the payload does not decode as KCellularLteTxPower: length past the end at byte 3");
+              "does not decode as KCellularLteTxPower: length past the end at byte 3");
 }
 
 TEST_F(DecodeRefusal, TruncatedFixedWidthValue) {
     EXPECT_EQ(errorOf(3986178, "0801a101010203"),
-              "the payload does not decode as KCellularLteTxPower: truncated fixed-width value at "
+              "does not decode as KCellularLteTxPower: truncated fixed-width value at "
               "byte 4");
 }
 
 TEST_F(DecodeRefusal, UnknownWireType) {
     EXPECT_EQ(errorOf(3986178, "08014f"),
-              "the payload does not decode as KCellularLteTxPower: unknown wire type at byte 2");
+              "does not decode as KCellularLteTxPower: unknown wire type at byte 2");
 }
 
 TEST_F(DecodeRefusal, MismatchedEndOfGroup) {
     EXPECT_EQ(errorOf(3986178, "0801bb01c401"),
-              "the payload does not decode as KCellularLteTxPower: end of group does not match "
+              "does not decode as KCellularLteTxPower: end of group does not match "
               "its start at byte 4");
 }
 
 TEST_F(DecodeRefusal, GroupWithoutItsEnd) {
-    EXPECT_EQ(
-        errorOf(3986178, "0801bb010802"),
-        "the payload does not decode as KCellularLteTxPower: group without its end at byte 2");
+    EXPECT_EQ(errorOf(3986178, "0801bb010802"),
+              "does not decode as KCellularLteTxPower: group without its end at byte 2");
 }
 
 TEST_F(Decode, LineThatIsNotARecordGivesNullMetric) {

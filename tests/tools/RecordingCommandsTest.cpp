@@ -451,7 +451,8 @@ TEST(ExportCommand, ARecordTheStoreRefusesIsSkippedWithOneLineAndCounted) {
     EXPECT_EQ(linesOf(run.err),
               (std::vector<std::string>{
                   "pyxonctl export: event " + std::to_string(badID) +
-                      " skipped: 0x3C4E04: the payload does not decode as KCellularLteRrcState",
+                      " skipped: 0x3C4E04: does not decode as KCellularLteRrcState: truncated "
+                      "varint at byte 0",
                   "pyxonctl export: 1 of 1 records were refused by the store and skipped"}));
     static_cast<void>(kRsrpKind);
 }
