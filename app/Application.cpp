@@ -33,6 +33,9 @@ struct Options {
     std::string source = "sim";
     std::uint64_t seed = 1;
     double speed = 1.0;
+    bool loop = false;
+    std::optional<std::string> record;
+    bool append = false;
     std::optional<std::string> screenshots;
     std::optional<std::string> chart;
 };
@@ -67,9 +70,19 @@ int runPyxon(int argc, char** argv) {
     cli.add_option("--seed", options.seed, "Seed of the simulated baseband's drive")
         ->capture_default_str();
     cli.add_option("--speed", options.speed,
-                   "Speed factor of the simulated baseband (2 = events twice as often)")
-        ->check(CLI::PositiveNumber)
+                   "Speed factor: the simulated baseband's events come this many times as often "
+                   "(> 0); a replay divides the recorded timing by it (0 = as fast as the store "
+                   "takes them)")
+        ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
+    cli.add_flag("--loop", options.loop, "Replay: start again at the end of the recording");
+    CLI::Option* record =
+        cli.add_option("--record", options.record,
+                       "Keep every event of this run in FILE (.pyxrec), raw and in order")
+            ->type_name("FILE");
+    cli.add_flag("--append", options.append,
+                 "With --record: add a new session to an existing recording")
+        ->needs(record);
     cli.add_option("--screenshots", options.screenshots,
                    "Render every screen and chart page to PNG files in this folder, then quit")
         ->type_name("DIR");
@@ -77,10 +90,12 @@ int runPyxon(int argc, char** argv) {
                    "Open the chart page of the screen GROUP/CATEGORY at start (window only)")
         ->type_name("GROUP/CATEGORY");
     cli.set_version_flag("--version", std::string("pyxon ") + PYXON_VERSION);
-    cli.footer(std::string(sources::sourceHelp()) +
+    cli.footer(std::string(sources::sourceHelp()) + "\n" + std::string(sources::recordingHelp()) +
                "\nExamples:\n"
                "  pyxon --headless --speed 20\n"
                "  pyxon --source modem\n"
+               "  pyxon --source modem --record drive.pyxrec\n"
+               "  pyxon --source replay:drive.pyxrec --speed 4 --loop\n"
                "  pyxon --chart 'LTE/Serving Cell Meas'\n"
                "  pyxon --screenshots shots   (simulated time runs 30 times faster unless "
                "--speed is given)\n");
@@ -139,9 +154,25 @@ int runPyxon(int argc, char** argv) {
     const RejectedRecords rejected(MainQueue::shared());
 
     std::shared_ptr<velk::client::Transport> transport;
+    std::shared_ptr<recordings::RecordingWriter> recording;
     try {
-        transport = sources::makeTransport(
-            sources::SourceOptions{*sourceSpec, options.seed, options.speed, false});
+        // A replay waits while the events it handed out are not yet taken in by the store.
+        sources::SourceOptions sourceOptions;
+        sourceOptions.spec = *sourceSpec;
+        sourceOptions.seed = options.seed;
+        sourceOptions.speed = options.speed;
+        sourceOptions.loop = options.loop;
+        sourceOptions.backlog = [] {
+            return MainQueue::shared().pending() + VelkWrapper::queue().pending();
+        };
+        transport = sources::makeTransport(sourceOptions);
+        if (options.record) {
+            auto recorded = sources::recordSource(
+                std::move(transport), sourceOptions,
+                sources::RecordOptions{*options.record, options.append, PYXON_VERSION});
+            transport = std::move(recorded.transport);
+            recording = std::move(recorded.writer);
+        }
     } catch (const sources::SourceSpecError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;
@@ -173,6 +204,8 @@ int runPyxon(int argc, char** argv) {
     appDelegate.applicationWillTerminate();
     // The source's thread stops here, before exit destroys the queues it posts events to.
     transport->stopEvents();
+    // What is still queued for the recording is written before the process ends.
+    if (recording) recording->close();
     return status;
 }
 
