@@ -14,6 +14,7 @@
 #include <cstdint>
 #include <cstdlib>
 #include <string>
+#include <variant>
 #include <vector>
 
 #include "core/Log.h"
@@ -112,7 +113,8 @@ modem::ModemFacts anyFacts(FuzzedDataProvider& in) {
 
 void expectDecodes(std::int64_t metricID, const pyx::Bytes& payload) {
     const pyx::MetricKind* kind = pyx::findMetricKind(metricID);
-    if (kind == nullptr || !kind->decodable() || !kind->decode(payload)) {
+    if (kind == nullptr || !kind->decodable() ||
+        !std::holds_alternative<pyx::Dict>(kind->decode(payload))) {
         std::fprintf(stderr, "metric 0x%llX: its payload does not decode\n",
                      static_cast<unsigned long long>(metricID));
         std::abort();
