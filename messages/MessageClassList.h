@@ -7,6 +7,8 @@
 // is defined in that group's .cpp file.
 #pragma once
 
+#include <cstddef>
+
 // clang-format off
 #define PYX_MESSAGE_CLASSES(CLASS)                                                                 \
     CLASS(lte, KCellularLteCdrxConfig)                                                             \
@@ -66,3 +68,12 @@
     CLASS(nas, BearerContext)                                                                      \
     CLASS(nas, ElementaryFile)
 // clang-format on
+
+namespace pyx {
+
+// How many classes the list has.
+#define PYX_COUNT_CLASS(group, Class) +1
+inline constexpr std::size_t kMessageClassCount = 0 PYX_MESSAGE_CLASSES(PYX_COUNT_CLASS);
+#undef PYX_COUNT_CLASS
+
+}  // namespace pyx
