@@ -239,13 +239,4 @@ bool Drive::reports(std::int64_t metricID) {
     return findReported(metricID) != nullptr;
 }
 
-const std::vector<std::int64_t>& Drive::reportedMetricIDs() {
-    static const std::vector<std::int64_t> ids = [] {
-        std::vector<std::int64_t> out;
-        for (const auto& r : kReported) out.push_back(r.metricID);
-        return out;
-    }();
-    return ids;
-}
-
 }  // namespace pyx::sim
