@@ -96,6 +96,7 @@ struct KindOf;
 
 template <class Ours, class Reference>
 struct KindOf<Decoded<Ours, Reference>> {
+    static constexpr bool decoded = true;
     static constexpr BenchKind make(std::int64_t metricID, std::string_view name) {
         return BenchKind{metricID,
                          name,
@@ -113,6 +114,7 @@ struct KindOf<Decoded<Ours, Reference>> {
 
 template <>
 struct KindOf<NotDecoded> {
+    static constexpr bool decoded = false;
     static constexpr BenchKind make(std::int64_t, std::string_view) { return BenchKind{}; }
 };
 
@@ -126,17 +128,19 @@ struct KindOf<NotDecoded> {
     KindOf<PYX_BENCH_TYPE_##decoding>::make(id, PYX_BENCH_NAME_##decoding),
 constexpr BenchKind kAllKinds[] = {PYX_METRIC_KINDS(PYX_BENCH_KIND)};
 #undef PYX_BENCH_KIND
+#define PYX_BENCH_DECODED(constant, id, decoding, ...) KindOf<PYX_BENCH_TYPE_##decoding>::decoded,
+constexpr bool kDecoded[] = {PYX_METRIC_KINDS(PYX_BENCH_DECODED)};
+#undef PYX_BENCH_DECODED
 
-constexpr std::size_t kDecodedCount = static_cast<std::size_t>(
-    std::count_if(std::begin(kAllKinds), std::end(kAllKinds),
-                  [](const BenchKind& k) { return k.oursDecode != nullptr; }));
+constexpr std::size_t kDecodedCount =
+    static_cast<std::size_t>(std::count(std::begin(kDecoded), std::end(kDecoded), true));
 
 // The kinds the intake decodes, in catalogue order.
 constexpr auto kKinds = [] {
     std::array<BenchKind, kDecodedCount> kinds{};
     std::size_t n = 0;
-    for (const BenchKind& k : kAllKinds) {
-        if (k.oursDecode != nullptr) kinds[n++] = k;
+    for (std::size_t i = 0; i < std::size(kAllKinds); ++i) {
+        if (kDecoded[i]) kinds[n++] = kAllKinds[i];
     }
     return kinds;
 }();

@@ -64,12 +64,25 @@ constexpr bool idsAreDistinctMetricIDs() {
 }
 static_assert(idsAreDistinctMetricIDs(), "each kind has its own ID of the form 0x3C0000 + tag");
 
+// Whether each kind is decoded, read from its decoding column (a function's address is not
+// compared in a constant expression).
+#define PYX_IS_DECODED_DECODED(Class) true
+#define PYX_IS_DECODED_IGNORED(Class) false
+#define PYX_IS_DECODED_IGNORED_UNCLASSED false
+#define PYX_IS_DECODED(constant, id, decoding, ...) PYX_IS_DECODED_##decoding,
+constexpr bool kDecoded[] = {PYX_METRIC_KINDS(PYX_IS_DECODED)};
+#undef PYX_IS_DECODED
+#undef PYX_IS_DECODED_IGNORED_UNCLASSED
+#undef PYX_IS_DECODED_IGNORED
+#undef PYX_IS_DECODED_DECODED
+
 constexpr bool decodedKindsAreComplete() {
-    for (const MetricKind& kind : kCatalogue) {
+    for (std::size_t i = 0; i < std::size(kCatalogue); ++i) {
+        const MetricKind& kind = kCatalogue[i];
         // A decoded kind has a class, a property and an arrival line; a kind that is not
         // cared for has no arrival line.
-        if (kind.decodable() != !kind.logPrefix.empty()) return false;
-        if (kind.decodable() && (kind.messageClass.empty() || !kind.property)) return false;
+        if (kDecoded[i] != !kind.logPrefix.empty()) return false;
+        if (kDecoded[i] && (kind.messageClass.empty() || !kind.property)) return false;
     }
     return true;
 }

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <array>
-#include <iterator>
 #include <string>
 
 #include "core/MetricKindList.h"
@@ -20,29 +19,16 @@ struct Reported {
     Writer write;
 };
 
-// Every metric the simulated baseband reports, in catalogue order: each kind of the list of
-// metric kinds that names a payload writer.
+// Every metric kind in catalogue order, with the payload writer of the kinds the simulated
+// baseband reports (nullptr for the others).
 #define PYX_REPORTED(constant, id, decoding, store, logPrefix, work, tagText, simWriter) \
     Reported{id, simWriter},
-constexpr Reported kAllKinds[] = {PYX_METRIC_KINDS(PYX_REPORTED)};
+constexpr Reported kKinds[] = {PYX_METRIC_KINDS(PYX_REPORTED)};
 #undef PYX_REPORTED
 
-constexpr std::size_t kReportedCount =
-    static_cast<std::size_t>(std::count_if(std::begin(kAllKinds), std::end(kAllKinds),
-                                           [](const Reported& r) { return r.write != nullptr; }));
-
-constexpr auto kReported = [] {
-    std::array<Reported, kReportedCount> reported{};
-    std::size_t n = 0;
-    for (const Reported& r : kAllKinds) {
-        if (r.write != nullptr) reported[n++] = r;
-    }
-    return reported;
-}();
-
 const Reported* findReported(std::int64_t metricID) {
-    for (const auto& r : kReported)
-        if (r.metricID == metricID) return &r;
+    for (const auto& r : kKinds)
+        if (r.metricID == metricID && r.write != nullptr) return &r;
     return nullptr;
 }
 
