@@ -3,8 +3,11 @@
 #include <benchmark/benchmark.h>
 #include <google/protobuf/util/json_util.h>
 
+#include <algorithm>
 #include <array>
+#include <iterator>
 
+#include "core/MetricKindList.h"
 #include "messages/Messages.h"
 #include "pyxon_bench.pb.h"
 
@@ -83,62 +86,73 @@ const google::protobuf::Descriptor* referenceDescriptor() {
     return Reference::descriptor();
 }
 
+// What a kind of the list of metric kinds contributes: a BenchKind when it is decoded.
 template <class Ours, class Reference>
-constexpr BenchKind kind(std::int64_t metricID, std::string_view name) {
-    return BenchKind{metricID,
-                     name,
-                     &oursDecode<Ours>,
-                     &oursDictionary<Ours>,
-                     &referenceDecodeFresh<Reference>,
-                     &referenceDecodeReused<Reference>,
-                     &referenceJson<Reference>,
-                     &oursRoundTrip<Ours>,
-                     &referenceRoundTrip<Reference>,
-                     &Ours::descriptor,
-                     &referenceDescriptor<Reference>};
-}
+struct Decoded {};
+struct NotDecoded {};
 
-#define PYX_BENCH_KIND(id, Class) kind<::pyx::Class, ::pyxbench::Class>(id, #Class)
+template <class Kind>
+struct KindOf;
 
-const std::array<BenchKind, 30> kKinds = {
-    PYX_BENCH_KIND(3952152, KCellularLteCdrxConfig),
-    PYX_BENCH_KIND(3952132, KCellularLteRrcState),
-    PYX_BENCH_KIND(3948738, KCellularLteScellInfo),
-    PYX_BENCH_KIND(3986190, KCellularLteSelReselCellInfo),
-    PYX_BENCH_KIND(3986178, KCellularLteTxPower),
-    PYX_BENCH_KIND(3952490, KCellularLteRsrpRsrqSinr),
-    PYX_BENCH_KIND(3986187, KCellularLteComponentCarrierInfo),
-    PYX_BENCH_KIND(3986195, KCellularLteCarrierAggregationStatus),
-    PYX_BENCH_KIND(3986192, KCellularLteNbrInterRatCellMeas),
-    PYX_BENCH_KIND(3986191, KCellularLteNbrEutraCellMeas),
-    PYX_BENCH_KIND(3986199, KCellularLteSecondaryCellMeasurements),
-    PYX_BENCH_KIND(3986697, KCellularMmCommonInfo),
-    PYX_BENCH_KIND(3986701, KCellularActivatedBearerContexts),
-    PYX_BENCH_KIND(3986700, KCellularEmmContext),
-    PYX_BENCH_KIND(3986698, KCellularMmContext),
-    PYX_BENCH_KIND(3986699, KCellularGmmContext),
-    PYX_BENCH_KIND(3985682, KCellularWcdmaRrcConnectionState),
-    PYX_BENCH_KIND(3985683, KCellularWcdmaRrcConfiguration),
-    PYX_BENCH_KIND(3944460, KCellularWcdmaCellInfo),
-    PYX_BENCH_KIND(3985666, KCellularWcdmaScellMeasurement),
-    PYX_BENCH_KIND(3985667, KCellularWcdmaTxPower),
-    PYX_BENCH_KIND(3985668, KCellularWcdmaSelReselCellInfo),
-    PYX_BENCH_KIND(3985669, KCellularWcdmaNbrCellMeas),
-    PYX_BENCH_KIND(3943948, KCellularGsmScellInfo),
-    PYX_BENCH_KIND(3985409, KCellularGsmIdleConfig),
-    PYX_BENCH_KIND(3985410, KCellularGsmIdleScellMeasurement),
-    PYX_BENCH_KIND(3985411, KCellularGsmCsRfMeasurement),
-    PYX_BENCH_KIND(3985417, KCellularGsmGrrEventMeasCr),
-    PYX_BENCH_KIND(3985420, KCellularGsmGprsConfig),
-    PYX_BENCH_KIND(3932179, KCellularSimCardFiles),
+template <class Ours, class Reference>
+struct KindOf<Decoded<Ours, Reference>> {
+    static constexpr bool decoded = true;
+    static constexpr BenchKind make(std::int64_t metricID, std::string_view name) {
+        return BenchKind{metricID,
+                         name,
+                         &oursDecode<Ours>,
+                         &oursDictionary<Ours>,
+                         &referenceDecodeFresh<Reference>,
+                         &referenceDecodeReused<Reference>,
+                         &referenceJson<Reference>,
+                         &oursRoundTrip<Ours>,
+                         &referenceRoundTrip<Reference>,
+                         &Ours::descriptor,
+                         &referenceDescriptor<Reference>};
+    }
 };
 
-#undef PYX_BENCH_KIND
+template <>
+struct KindOf<NotDecoded> {
+    static constexpr bool decoded = false;
+    static constexpr BenchKind make(std::int64_t, std::string_view) { return BenchKind{}; }
+};
 
-const std::array<ExtraClass, 1> kExtraClasses = {{
-    {&KCellularLteServingCellMeasurement::descriptor,
-     &referenceDescriptor<pyxbench::KCellularLteServingCellMeasurement>},
-}};
+#define PYX_BENCH_TYPE_DECODED(Class) Decoded<::pyx::Class, ::pyxbench::Class>
+#define PYX_BENCH_TYPE_IGNORED(Class) NotDecoded
+#define PYX_BENCH_TYPE_IGNORED_UNCLASSED NotDecoded
+#define PYX_BENCH_NAME_DECODED(Class) #Class
+#define PYX_BENCH_NAME_IGNORED(Class) ""
+#define PYX_BENCH_NAME_IGNORED_UNCLASSED ""
+#define PYX_BENCH_KIND(constant, id, decoding, ...) \
+    KindOf<PYX_BENCH_TYPE_##decoding>::make(id, PYX_BENCH_NAME_##decoding),
+constexpr BenchKind kAllKinds[] = {PYX_METRIC_KINDS(PYX_BENCH_KIND)};
+#undef PYX_BENCH_KIND
+#define PYX_BENCH_DECODED(constant, id, decoding, ...) KindOf<PYX_BENCH_TYPE_##decoding>::decoded,
+constexpr bool kDecoded[] = {PYX_METRIC_KINDS(PYX_BENCH_DECODED)};
+#undef PYX_BENCH_DECODED
+
+constexpr std::size_t kDecodedCount =
+    static_cast<std::size_t>(std::count(std::begin(kDecoded), std::end(kDecoded), true));
+
+// The kinds the intake decodes, in catalogue order.
+constexpr auto kKinds = [] {
+    std::array<BenchKind, kDecodedCount> kinds{};
+    std::size_t n = 0;
+    for (std::size_t i = 0; i < std::size(kAllKinds); ++i) {
+        if (kDecoded[i]) kinds[n++] = kAllKinds[i];
+    }
+    return kinds;
+}();
+
+// The message classes of the kinds that are catalogued but not decoded.
+#define PYX_BENCH_EXTRA_DECODED(Class)
+#define PYX_BENCH_EXTRA_IGNORED(Class) \
+    ExtraClass{&::pyx::Class::descriptor, &referenceDescriptor<::pyxbench::Class>},
+#define PYX_BENCH_EXTRA_IGNORED_UNCLASSED
+#define PYX_BENCH_EXTRA(constant, id, decoding, ...) PYX_BENCH_EXTRA_##decoding
+const ExtraClass kExtraClasses[] = {PYX_METRIC_KINDS(PYX_BENCH_EXTRA)};
+#undef PYX_BENCH_EXTRA
 
 }  // namespace
 

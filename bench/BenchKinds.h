@@ -41,7 +41,7 @@ struct BenchKind {
     const google::protobuf::Descriptor* (*referenceDescriptor)();
 };
 
-// The 30 kinds the intake decodes, in catalogue order.
+// The kinds the intake decodes, in catalogue order.
 [[nodiscard]] std::span<const BenchKind> benchKinds();
 // The kind of a metric ID, or nullptr.
 [[nodiscard]] const BenchKind* benchKindFor(std::int64_t metricID);

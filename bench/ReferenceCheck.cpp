@@ -6,6 +6,7 @@
 #include <string>
 
 #include "bench/BenchKinds.h"
+#include "messages/MessageClassList.h"
 
 namespace pyx::bench {
 
@@ -115,9 +116,10 @@ bool checkReference(const std::vector<CorpusRecord>& corpus, std::ostream& out) 
     for (const ExtraClass& extra : extraClasses()) {
         checker.compare(extra.oursDescriptor(), *extra.referenceDescriptor());
     }
-    if (checker.visited.size() != 56) {
+    if (checker.visited.size() != kMessageClassCount) {
         checker.fail("schemas", std::to_string(checker.visited.size()) +
-                                    " message classes compared, 56 expected");
+                                    " message classes compared, " +
+                                    std::to_string(kMessageClassCount) + " expected");
     }
 
     std::set<std::int64_t> kindsSeen;

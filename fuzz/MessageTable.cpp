@@ -1,8 +1,8 @@
 #include "fuzz/MessageTable.h"
 
-#include <array>
 #include <cstdio>
 #include <cstdlib>
+#include <iterator>
 
 #include "messages/Messages.h"
 
@@ -51,71 +51,9 @@ void check(std::span<const std::uint8_t> payload) {
     if (!merged.isEqual(first)) broken(name, "merging into an empty message changes it");
 }
 
-#define PYX_FUZZ_CLASS(Class)          \
-    FuzzClass {                        \
-#Class, &check < ::pyx::Class> \
-    }
-
-const std::array<FuzzClass, 56> kClasses = {
-    // The metric kinds first, then the nested records.
-    PYX_FUZZ_CLASS(KCellularLteCdrxConfig),
-    PYX_FUZZ_CLASS(KCellularLteRrcState),
-    PYX_FUZZ_CLASS(KCellularLteScellInfo),
-    PYX_FUZZ_CLASS(KCellularLteSelReselCellInfo),
-    PYX_FUZZ_CLASS(KCellularLteServingCellMeasurement),
-    PYX_FUZZ_CLASS(KCellularLteTxPower),
-    PYX_FUZZ_CLASS(KCellularLteRsrpRsrqSinr),
-    PYX_FUZZ_CLASS(KCellularLteComponentCarrierInfo),
-    PYX_FUZZ_CLASS(KCellularLteCarrierAggregationStatus),
-    PYX_FUZZ_CLASS(KCellularLteNbrInterRatCellMeas),
-    PYX_FUZZ_CLASS(KCellularLteNbrEutraCellMeas),
-    PYX_FUZZ_CLASS(KCellularLteSecondaryCellMeasurements),
-    PYX_FUZZ_CLASS(KCellularMmCommonInfo),
-    PYX_FUZZ_CLASS(KCellularActivatedBearerContexts),
-    PYX_FUZZ_CLASS(KCellularEmmContext),
-    PYX_FUZZ_CLASS(KCellularMmContext),
-    PYX_FUZZ_CLASS(KCellularGmmContext),
-    PYX_FUZZ_CLASS(KCellularWcdmaRrcConnectionState),
-    PYX_FUZZ_CLASS(KCellularWcdmaRrcConfiguration),
-    PYX_FUZZ_CLASS(KCellularWcdmaCellInfo),
-    PYX_FUZZ_CLASS(KCellularWcdmaScellMeasurement),
-    PYX_FUZZ_CLASS(KCellularWcdmaTxPower),
-    PYX_FUZZ_CLASS(KCellularWcdmaSelReselCellInfo),
-    PYX_FUZZ_CLASS(KCellularWcdmaNbrCellMeas),
-    PYX_FUZZ_CLASS(KCellularGsmScellInfo),
-    PYX_FUZZ_CLASS(KCellularGsmIdleConfig),
-    PYX_FUZZ_CLASS(KCellularGsmIdleScellMeasurement),
-    PYX_FUZZ_CLASS(KCellularGsmCsRfMeasurement),
-    PYX_FUZZ_CLASS(KCellularGsmGrrEventMeasCr),
-    PYX_FUZZ_CLASS(KCellularGsmGprsConfig),
-    PYX_FUZZ_CLASS(KCellularSimCardFiles),
-    PYX_FUZZ_CLASS(RxInfo),
-    PYX_FUZZ_CLASS(EgwErrcNbrEutraMeas),
-    PYX_FUZZ_CLASS(EgwErrcNbrUtraMeas),
-    PYX_FUZZ_CLASS(EgwErrcNbrGeranMeas),
-    PYX_FUZZ_CLASS(NbrEutra),
-    PYX_FUZZ_CLASS(SecondaryComponentCarrier),
-    PYX_FUZZ_CLASS(SccRxMeasurement),
-    PYX_FUZZ_CLASS(TxPowerInfo),
-    PYX_FUZZ_CLASS(RsrpRsrqSinr),
-    PYX_FUZZ_CLASS(UtraCellMeasResult),
-    PYX_FUZZ_CLASS(GsmCellMeasResult),
-    PYX_FUZZ_CLASS(LteCellMeasResult),
-    PYX_FUZZ_CLASS(EutraFreqInfo),
-    PYX_FUZZ_CLASS(UtraFreqInfo),
-    PYX_FUZZ_CLASS(GsmFreqInfo),
-    PYX_FUZZ_CLASS(GsmNcellMeas),
-    PYX_FUZZ_CLASS(UmtsNcellMeas),
-    PYX_FUZZ_CLASS(LteNcellMeas),
-    PYX_FUZZ_CLASS(Plmn),
-    PYX_FUZZ_CLASS(KCellularLocationAreaId),
-    PYX_FUZZ_CLASS(RoutingAreaId),
-    PYX_FUZZ_CLASS(KCellularTrackingAreaId),
-    PYX_FUZZ_CLASS(Guti),
-    PYX_FUZZ_CLASS(BearerContext),
-    PYX_FUZZ_CLASS(ElementaryFile),
-};
-
+// Every class of the list of message classes, in its order.
+#define PYX_FUZZ_CLASS(group, Class) FuzzClass{#Class, &check<::pyx::Class>},
+const FuzzClass kClasses[] = {PYX_MESSAGE_CLASSES(PYX_FUZZ_CLASS)};
 #undef PYX_FUZZ_CLASS
 
 }  // namespace
@@ -125,7 +63,7 @@ std::span<const FuzzClass> fuzzClasses() {
 }
 
 int fuzzClassIndex(std::string_view name) {
-    for (std::size_t i = 0; i < kClasses.size(); ++i) {
+    for (std::size_t i = 0; i < std::size(kClasses); ++i) {
         if (kClasses[i].name == name) return static_cast<int>(i);
     }
     return -1;

@@ -1,4 +1,4 @@
-// The 56 message classes as the message reader target sees them: the input's first byte picks
+// The message classes as the message reader target sees them: the input's first byte picks
 // one (modulo the count), the rest is its payload.
 #pragma once
 

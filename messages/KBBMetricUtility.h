@@ -5,10 +5,12 @@
 
 #include <array>
 #include <concepts>
+#include <cstddef>
 #include <cstdint>
 #include <string_view>
 #include <utility>
 
+#include "core/MetricKindList.h"
 #include "messages/MessageDescriptor.h"
 
 namespace pyx {
@@ -20,41 +22,29 @@ class KBBMetricUtility {
         std::string_view className;
     };
 
-    // The 31 rows: tag and the class-name text it stands for (texts kept as the baseband
-    // names them, lower-case "k" included).
-    static constexpr std::array<Entry, 31> kEntries{{
-        {0x4E04, "KCellularLteRrcState"},
-        {0x4E18, "KCellularLteCdrxConfig"},
-        {0x4E25, "KCellularLteRadioLinkFailure"},
-        {0x40C2, "KCellularLteScellInfo"},
-        {0xD30E, "KCellularLteSelReselCellInfo"},
-        {0xD301, "KCellularLteServingCellMeasurement"},
-        {0xD302, "KCellularLteTxPower"},
-        {0x4F6A, "KCellularRsrpRsrqSinr"},
-        {0xD50C, "KCellularEmmContext"},
-        {0xD30B, "KCellularLteComponentCarrierInfo"},
-        {0xD313, "KCellularLteCarrierAggregationStatus"},
-        {0xD310, "KCellularLteNbrInterRatCellMeas"},
-        {0xD30F, "KCellularLteNbrEutraCellMeas"},
-        {0xD509, "KCellularMmCommonInfo"},
-        {0xD50D, "KCellularActivatedBearerContexts"},
-        {0xD112, "KCellularWcdmaRrcConnectionState"},
-        {0x300C, "KCellularWcdmaCellInfo"},
-        {0xD102, "KCellularWcdmaScellMeasurement"},
-        {0xD103, "KCellularWcdmaTxPower"},
-        {0xD105, "KCellularWcdmaNbrCellMeas"},
-        {0xD104, "KCellularWcdmaSelReselCellInfo"},
-        {0xD113, "KCellularWcdmaRrcConfiguration"},
-        {0xD50A, "KCellularMmContext"},
-        {0xD50B, "KCellularGmmContext"},
-        {0x2E0C, "kCellularGsmScellInfo"},
-        {0xD001, "kCellularGsmIdleConfig"},
-        {0xD002, "kCellularGsmIdleScellMeasurement"},
-        {0xD003, "kCellularGsmCsRfMeasurement"},
-        {0xD009, "kCellularGsmGrrEventMeasCr"},
-        {0xD00C, "kCellularGsmGprsConfig"},
-        {0x0013, "kCellularSimCardFiles"},
-    }};
+    // The rows: the tag and the class-name text it stands for (texts kept as the baseband
+    // names them, lower-case "k" included), for every kind of the list of metric kinds that
+    // has a tag text. Only the tag (the low 16 bits of the metric ID) is read here.
+    static constexpr std::size_t kRowCount = [] {
+        std::size_t count = 0;
+#define PYX_COUNT_TAG(constant, id, decoding, store, logPrefix, work, tagText, ...) \
+    if (!std::string_view(tagText).empty()) ++count;
+        PYX_METRIC_KINDS(PYX_COUNT_TAG)
+#undef PYX_COUNT_TAG
+        return count;
+    }();
+
+    static constexpr std::array<Entry, kRowCount> kEntries = [] {
+        std::array<Entry, kRowCount> rows{};
+        std::size_t n = 0;
+#define PYX_TAG_ROW(constant, id, decoding, store, logPrefix, work, tagText, ...) \
+    if (!std::string_view(tagText).empty()) {                                     \
+        rows[n++] = Entry{static_cast<std::uint16_t>((id)&0xFFFF), tagText};      \
+    }
+        PYX_METRIC_KINDS(PYX_TAG_ROW)
+#undef PYX_TAG_ROW
+        return rows;
+    }();
 
     // Whether tag is a metric tag; logs "valid metricId tag" when it is. The class is not
     // consulted: a metric tag is one for every message class.

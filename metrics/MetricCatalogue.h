@@ -1,6 +1,7 @@
 // The catalogue of metric kinds: for each known metric ID its constant, the message class
 // that decodes its payload, the dictionary property that keeps its latest value, the line
-// printed on its arrival and its kind-specific work. Each kind is declared once, here.
+// printed on its arrival and its kind-specific work. The kinds come from the one list of
+// metric kinds, core/MetricKindList.h.
 #pragma once
 
 #include <cstdint>
@@ -30,7 +31,7 @@ struct MetricKind {
     std::string_view logPrefix;
     KindWork work;  // nullptr: the stored dictionary is the decoded one, timestamp rewritten
 
-    [[nodiscard]] bool decodable() const { return decode != nullptr; }
+    [[nodiscard]] constexpr bool decodable() const { return decode != nullptr; }
 };
 
 // The 32 kinds, in the order of the K_* constants.

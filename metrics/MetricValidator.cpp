@@ -1,5 +1,6 @@
 #include "metrics/MetricValidator.h"
 
+#include <algorithm>
 #include <array>
 #include <cstdio>
 #include <mutex>
@@ -22,11 +23,22 @@ std::string describeRejection(const std::optional<std::int64_t>& metricID,
     return std::string("metric ") + id + ": " + reason;
 }
 
-constexpr std::array<std::string_view, MetricValidator::kDictionaryPropertyCount> kPropertyNames = {
-#define PYX_NAME(name, setter) #name,
-    PYX_METRIC_DICTIONARIES(PYX_NAME)
+// The property names by slot. A slot given twice leaves another one empty, and a slot past the
+// end does not compile: either way the list of kinds is refused here.
+constexpr auto kPropertyNames = [] {
+    std::array<std::string_view, MetricValidator::kDictionaryPropertyCount> names{};
+#define PYX_NAME_STORED(name, setter, slot) names[slot] = #name;
+#define PYX_NAME_UNSTORED
+#define PYX_NAME(constant, id, decoding, store, ...) PYX_NAME_##store
+    PYX_METRIC_KINDS(PYX_NAME)
 #undef PYX_NAME
-};
+#undef PYX_NAME_UNSTORED
+#undef PYX_NAME_STORED
+    return names;
+}();
+static_assert(std::none_of(kPropertyNames.begin(), kPropertyNames.end(),
+                           [](std::string_view name) { return name.empty(); }),
+              "every store slot is given to exactly one kind");
 
 std::size_t indexOf(MetricValidator::DictionaryProperty p) {
     return static_cast<std::size_t>(p);

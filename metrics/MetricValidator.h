@@ -15,6 +15,7 @@
 
 #include "baseband/VelkWrapper.h"
 #include "baseband/VelkWrapperDelegate.h"
+#include "core/MetricKindList.h"
 #include "metrics/ListHolders.h"
 
 namespace pyx {
@@ -49,39 +50,10 @@ class MetricValidator : public VelkWrapperDelegate,
     MetricValidator& operator=(const MetricValidator&) = delete;
     ~MetricValidator() override;
 
-    // The catalogue.
-    const std::int64_t K_LTE_CDRX_CONFIG = 3952152;
-    const std::int64_t K_LTE_RRC_STATE = 3952132;
-    const std::int64_t K_LTE_SCELL_INFO = 3948738;
-    const std::int64_t K_LTE_RLF = 3952165;
-    const std::int64_t K_LTE_SEL_RESEL_INFO = 3986190;
-    const std::int64_t K_LTE_SCELL_MEAS = 3986177;
-    const std::int64_t K_LTE_TX_POWER = 3986178;
-    const std::int64_t K_LTE_RSRP_RSRQ_SINR = 3952490;
-    const std::int64_t K_LTE_COMPCARR_INFO = 3986187;
-    const std::int64_t K_LTE_CA_STATUS = 3986195;
-    const std::int64_t K_LTE_INTERRAT_MEAS = 3986192;
-    const std::int64_t K_LTE_INTRARAT_MEAS = 3986191;
-    const std::int64_t K_LTE_SECONDARYCELL_MEAS = 3986199;
-    const std::int64_t K_CELLULAR_MM_INFO = 3986697;
-    const std::int64_t K_CELLULAR_ACTIVE_BEARER = 3986701;
-    const std::int64_t K_LTE_EMM_CTXT = 3986700;
-    const std::int64_t K_CELLULAR_MM_CTXT = 3986698;
-    const std::int64_t K_CELLULAR_GMM_CTXT = 3986699;
-    const std::int64_t K_UMTS_RRC_STATE = 3985682;
-    const std::int64_t K_UMTS_RRC_CONFIG = 3985683;
-    const std::int64_t K_UMTS_SCELL_INFO = 3944460;
-    const std::int64_t K_UMTS_SCELL_MEAS = 3985666;
-    const std::int64_t K_UMTS_TX_POWER = 3985667;
-    const std::int64_t K_UMTS_SEL_RESEL_INFO = 3985668;
-    const std::int64_t K_UMTS_NCELL_MEAS = 3985669;
-    const std::int64_t K_GSM_SCELL_INFO = 3943948;
-    const std::int64_t K_GSM_IDLE_CONFIG = 3985409;
-    const std::int64_t K_GSM_IDLE_SCELL_MEAS = 3985410;
-    const std::int64_t K_GSM_CS_RF_MEAS = 3985411;
-    const std::int64_t K_GSM_NCELL_MEAS = 3985417;
-    const std::int64_t K_GSM_GPRS_CONFIG = 3985420;
-    const std::int64_t K_SIM_FILE_INFO = 3932179;
+    // The catalogue: one constant per metric kind.
+#define PYX_CONSTANT(constant, id, ...) const std::int64_t constant = id;
+    PYX_METRIC_KINDS(PYX_CONSTANT)
+#undef PYX_CONSTANT
 
     [[nodiscard]] const std::shared_ptr<VelkWrapper>& mySharedVelkInstance() const {
         return mySharedVelkInstance_;
@@ -92,64 +64,54 @@ class MetricValidator : public VelkWrapperDelegate,
     const std::string profileIDKey = "kKeyProfileID";
 
     // The ID of the record being (or last) processed.
-    [[nodiscard]] const std::optional<std::int64_t>& metricID() const { return metricID_; }
+    [[nodiscard]] const std::optional<std::int64_t>& metricID() const {
+        return metricID_;
+    }
 
-    [[nodiscard]] const LTEListHolder& myLTE() const { return myLTE_; }
-    [[nodiscard]] const UMTSListHolder& myUMTS() const { return myUMTS_; }
-    [[nodiscard]] const GSMListHolder& myGSM() const { return myGSM_; }
-    [[nodiscard]] const CommonListHolder& myCommon() const { return myCommon_; }
+    [[nodiscard]] const LTEListHolder& myLTE() const {
+        return myLTE_;
+    }
+    [[nodiscard]] const UMTSListHolder& myUMTS() const {
+        return myUMTS_;
+    }
+    [[nodiscard]] const GSMListHolder& myGSM() const {
+        return myGSM_;
+    }
+    [[nodiscard]] const CommonListHolder& myCommon() const {
+        return myCommon_;
+    }
 
-    // The 31 dictionary properties, each with a getter and a setter (absent until its kind
-    // first arrives), declared through one list.
-#define PYX_METRIC_DICTIONARIES(X)                               \
-    X(myLTERRCStateDict, setMyLTERRCStateDict)                   \
-    X(myLTECDRXConfigDict, setMyLTECDRXConfigDict)               \
-    X(myLTESCellInfoDict, setMyLTESCellInfoDict)                 \
-    X(myLTESCellMeasDict, setMyLTESCellMeasDict)                 \
-    X(myLTESelReselDict, setMyLTESelReselDict)                   \
-    X(myLTERsrpRsrqSinrDict, setMyLTERsrpRsrqSinrDict)           \
-    X(myLTECompCarrDict, setMyLTECompCarrDict)                   \
-    X(myLTETxPowerDict, setMyLTETxPowerDict)                     \
-    X(myLTEInterRatMeasDict, setMyLTEInterRatMeasDict)           \
-    X(myLTEIntraRatMeasDict, setMyLTEIntraRatMeasDict)           \
-    X(myLTECAStatusDict, setMyLTECAStatusDict)                   \
-    X(myLTESecondaryCellMeasDict, setMyLTESecondaryCellMeasDict) \
-    X(myLTEEMMContextDict, setMyLTEEMMContextDict)               \
-    X(myCellularMMCommonInfoDict, setMyCellularMMCommonInfoDict) \
-    X(myCellularActiveBearerDict, setMyCellularActiveBearerDict) \
-    X(myGMMContextDict, setMyGMMContextDict)                     \
-    X(myMMContextDict, setMyMMContextDict)                       \
-    X(myUMTSRRCStateDict, setMyUMTSRRCStateDict)                 \
-    X(myUMTSRRCConfigDict, setMyUMTSRRCConfigDict)               \
-    X(myUMTSCellInfoDict, setMyUMTSCellInfoDict)                 \
-    X(myUMTSCellMeasDict, setMyUMTSCellMeasDict)                 \
-    X(myUMTSTxPowerDict, setMyUMTSTxPowerDict)                   \
-    X(myUMTSSelReselDict, setMyUMTSSelReselDict)                 \
-    X(myUMTSNbrMeasDict, setMyUMTSNbrMeasDict)                   \
-    X(myGSMScellInfoDict, setMyGSMScellInfoDict)                 \
-    X(myGSMIdleConfigInfoDict, setMyGSMIdleConfigInfoDict)       \
-    X(myGSMIdleScellMeasDict, setMyGSMIdleScellMeasDict)         \
-    X(myGSMConnRfMeasDict, setMyGSMConnRfMeasDict)               \
-    X(myGSMNbrMeasDict, setMyGSMNbrMeasDict)                     \
-    X(myGSMGPRSConfigDict, setMyGSMGPRSConfigDict)               \
-    X(mySIMFileInfoDict, setMySIMFileInfoDict)
-
-    enum class DictionaryProperty {
-#define PYX_ENUMERATOR(name, setter) name,
-        PYX_METRIC_DICTIONARIES(PYX_ENUMERATOR)
+    // The dictionary properties of the stored kinds, each with a getter and a setter (absent
+    // until its kind first arrives), numbered in the store's declaration order.
+#define PYX_ENUMERATOR_STORED(name, setter, slot) name = slot,
+#define PYX_ENUMERATOR_UNSTORED
+#define PYX_ENUMERATOR(constant, id, decoding, store, ...) PYX_ENUMERATOR_##store
+    enum class DictionaryProperty { PYX_METRIC_KINDS(PYX_ENUMERATOR) };
 #undef PYX_ENUMERATOR
-    };
-    static constexpr std::size_t kDictionaryPropertyCount = 31;
+#undef PYX_ENUMERATOR_UNSTORED
+#undef PYX_ENUMERATOR_STORED
 
-#define PYX_ACCESSORS(name, setter)                                      \
+#define PYX_COUNT_STORED(name, setter, slot) +1
+#define PYX_COUNT_UNSTORED
+#define PYX_COUNT(constant, id, decoding, store, ...) PYX_COUNT_##store
+    static constexpr std::size_t kDictionaryPropertyCount = 0 PYX_METRIC_KINDS(PYX_COUNT);
+#undef PYX_COUNT
+#undef PYX_COUNT_UNSTORED
+#undef PYX_COUNT_STORED
+
+#define PYX_ACCESSORS_STORED(name, setter, slot)                         \
     [[nodiscard]] const std::optional<DisplayDictionary>& name() const { \
         return dictionary(DictionaryProperty::name);                     \
     }                                                                    \
     void setter(std::optional<DisplayDictionary> value) {                \
         setDictionary(DictionaryProperty::name, std::move(value));       \
     }
-    PYX_METRIC_DICTIONARIES(PYX_ACCESSORS)
+#define PYX_ACCESSORS_UNSTORED
+#define PYX_ACCESSORS(constant, id, decoding, store, ...) PYX_ACCESSORS_##store
+    PYX_METRIC_KINDS(PYX_ACCESSORS)
 #undef PYX_ACCESSORS
+#undef PYX_ACCESSORS_UNSTORED
+#undef PYX_ACCESSORS_STORED
 
     [[nodiscard]] const std::optional<DisplayDictionary>& dictionary(DictionaryProperty p) const;
     virtual void setDictionary(DictionaryProperty p, std::optional<DisplayDictionary> value);

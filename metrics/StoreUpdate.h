@@ -36,8 +36,6 @@ class StoreUpdate {
         put(&(common_.*list), std::move(entries));
     }
 
-    [[nodiscard]] std::size_t stagedCount() const { return used_; }
-
     // Moves every staged list into its holder.
     void commit() noexcept {
         for (std::size_t i = 0; i < used_; ++i) *slots_[i].target = std::move(slots_[i].entries);

@@ -66,9 +66,6 @@ const std::string& Manager::name() const {
 pyx::SerialQueue& Manager::queue() const {
     return state_->queue;
 }
-bool Manager::hasTransport() const {
-    return state_->transport != nullptr;
-}
 
 namespace {
 

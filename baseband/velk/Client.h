@@ -25,7 +25,6 @@ class Manager {
 
     [[nodiscard]] const std::string& name() const;
     [[nodiscard]] pyx::SerialQueue& queue() const;
-    [[nodiscard]] bool hasTransport() const;
 
   private:
     friend Result PerformCommand(std::shared_ptr<Manager>, const std::string&, const pyx::Value&,

@@ -1,25 +1,20 @@
 // The descriptor tables of the GSM message classes.
 #include "messages/MessageDefinition.h"
-#include "messages/gsm/GsmNcellMeas.h"
-#include "messages/gsm/KCellularGsmCsRfMeasurement.h"
-#include "messages/gsm/KCellularGsmGprsConfig.h"
-#include "messages/gsm/KCellularGsmGrrEventMeasCr.h"
-#include "messages/gsm/KCellularGsmIdleConfig.h"
-#include "messages/gsm/KCellularGsmIdleScellMeasurement.h"
-#include "messages/gsm/KCellularGsmScellInfo.h"
-#include "messages/gsm/LteNcellMeas.h"
-#include "messages/gsm/UmtsNcellMeas.h"
+#include "messages/Messages.h"
 
 namespace pyx {
 
-PYX_DEFINE_MESSAGE(KCellularGsmScellInfo)
-PYX_DEFINE_MESSAGE(KCellularGsmIdleConfig)
-PYX_DEFINE_MESSAGE(KCellularGsmGprsConfig)
-PYX_DEFINE_MESSAGE(KCellularGsmIdleScellMeasurement)
-PYX_DEFINE_MESSAGE(KCellularGsmCsRfMeasurement)
-PYX_DEFINE_MESSAGE(KCellularGsmGrrEventMeasCr)
-PYX_DEFINE_MESSAGE(GsmNcellMeas)
-PYX_DEFINE_MESSAGE(UmtsNcellMeas)
-PYX_DEFINE_MESSAGE(LteNcellMeas)
+// The classes of this group in the list of message classes.
+#define PYX_DEFINE_IN_gsm(Class) PYX_DEFINE_MESSAGE(Class)
+#define PYX_DEFINE_IF_GSM(group, Class) PYX_DEFINE_IN_##group(Class)
+#define PYX_DEFINE_IN_lte(Class)
+#define PYX_DEFINE_IN_umts(Class)
+#define PYX_DEFINE_IN_nas(Class)
+PYX_MESSAGE_CLASSES(PYX_DEFINE_IF_GSM)
+#undef PYX_DEFINE_IF_GSM
+#undef PYX_DEFINE_IN_lte
+#undef PYX_DEFINE_IN_umts
+#undef PYX_DEFINE_IN_gsm
+#undef PYX_DEFINE_IN_nas
 
 }  // namespace pyx

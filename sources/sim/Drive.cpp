@@ -4,6 +4,7 @@
 #include <array>
 #include <string>
 
+#include "core/MetricKindList.h"
 #include "sources/sim/Identities.h"
 #include "sources/sim/Payloads.h"
 
@@ -18,45 +19,16 @@ struct Reported {
     Writer write;
 };
 
-// Every metric the simulated baseband reports, in catalogue order.
-constexpr std::array<Reported, 32> kReported{{
-    {0x3C4E18, payloads::lteCdrxConfig},
-    {0x3C4E04, payloads::lteRrcState},
-    {0x3C40C2, payloads::lteScellInfo},
-    {0x3C4E25, payloads::lteRadioLinkFailure},
-    {0x3CD30E, payloads::lteSelReselInfo},
-    {0x3CD301, payloads::lteScellMeas},
-    {0x3CD302, payloads::lteTxPower},
-    {0x3C4F6A, payloads::lteRsrpRsrqSinr},
-    {0x3CD30B, payloads::lteComponentCarrierInfo},
-    {0x3CD313, payloads::lteCaStatus},
-    {0x3CD310, payloads::lteInterRatMeas},
-    {0x3CD30F, payloads::lteIntraRatMeas},
-    {0x3CD317, payloads::lteSecondaryCellMeas},
-    {0x3CD509, payloads::mmCommonInfo},
-    {0x3CD50D, payloads::activeBearers},
-    {0x3CD50C, payloads::emmContext},
-    {0x3CD50A, payloads::mmContext},
-    {0x3CD50B, payloads::gmmContext},
-    {0x3CD112, payloads::umtsRrcState},
-    {0x3CD113, payloads::umtsRrcConfig},
-    {0x3C300C, payloads::umtsScellInfo},
-    {0x3CD102, payloads::umtsScellMeas},
-    {0x3CD103, payloads::umtsTxPower},
-    {0x3CD104, payloads::umtsSelReselInfo},
-    {0x3CD105, payloads::umtsNcellMeas},
-    {0x3C2E0C, payloads::gsmScellInfo},
-    {0x3CD001, payloads::gsmIdleConfig},
-    {0x3CD002, payloads::gsmIdleScellMeas},
-    {0x3CD003, payloads::gsmCsRfMeas},
-    {0x3CD009, payloads::gsmNcellMeas},
-    {0x3CD00C, payloads::gsmGprsConfig},
-    {0x3C0013, payloads::simCardFiles},
-}};
+// Every metric kind in catalogue order, with the payload writer of the kinds the simulated
+// baseband reports (nullptr for the others).
+#define PYX_REPORTED(constant, id, decoding, store, logPrefix, work, tagText, simWriter) \
+    Reported{id, simWriter},
+constexpr Reported kKinds[] = {PYX_METRIC_KINDS(PYX_REPORTED)};
+#undef PYX_REPORTED
 
 const Reported* findReported(std::int64_t metricID) {
-    for (const auto& r : kReported)
-        if (r.metricID == metricID) return &r;
+    for (const auto& r : kKinds)
+        if (r.metricID == metricID && r.write != nullptr) return &r;
     return nullptr;
 }
 
@@ -251,15 +223,6 @@ std::optional<Bytes> Drive::payload(std::int64_t metricID, std::uint64_t timesta
 
 bool Drive::reports(std::int64_t metricID) {
     return findReported(metricID) != nullptr;
-}
-
-const std::vector<std::int64_t>& Drive::reportedMetricIDs() {
-    static const std::vector<std::int64_t> ids = [] {
-        std::vector<std::int64_t> out;
-        for (const auto& r : kReported) out.push_back(r.metricID);
-        return out;
-    }();
-    return ids;
 }
 
 }  // namespace pyx::sim

@@ -5,7 +5,6 @@
 
 #include <cstdint>
 #include <optional>
-#include <vector>
 
 #include "core/Value.h"
 #include "sources/sim/DriveState.h"
@@ -28,8 +27,6 @@ class Drive {
 
     // Whether payload() writes metricID.
     [[nodiscard]] static bool reports(std::int64_t metricID);
-    // Every metric ID the simulated baseband reports, in catalogue order.
-    [[nodiscard]] static const std::vector<std::int64_t>& reportedMetricIDs();
 
   private:
     void advanceRrc(std::uint64_t elapsedMs);

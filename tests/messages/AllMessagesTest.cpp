@@ -1,4 +1,4 @@
-// The common behaviour, checked for every one of the 56 message classes from its descriptor.
+// The common behaviour, checked for every message class from its descriptor.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -14,26 +14,12 @@ namespace {
 using test::buildPayload;
 using test::Payload;
 
-// clang-format off
-using AllMessages = ::testing::Types<
-    KCellularLteRrcState, KCellularLteScellInfo, KCellularLteServingCellMeasurement, RxInfo,
-    KCellularLteNbrEutraCellMeas, EgwErrcNbrEutraMeas, KCellularLteNbrInterRatCellMeas,
-    EgwErrcNbrUtraMeas, EgwErrcNbrGeranMeas, KCellularLteSelReselCellInfo, NbrEutra,
-    KCellularLteComponentCarrierInfo, KCellularLteCarrierAggregationStatus,
-    SecondaryComponentCarrier, KCellularLteSecondaryCellMeasurements, SccRxMeasurement,
-    KCellularLteTxPower, TxPowerInfo, KCellularLteCdrxConfig, KCellularLteRsrpRsrqSinr,
-    RsrpRsrqSinr,
-    KCellularWcdmaRrcConnectionState, KCellularWcdmaCellInfo, KCellularWcdmaRrcConfiguration,
-    KCellularWcdmaScellMeasurement, KCellularWcdmaNbrCellMeas, UtraCellMeasResult,
-    GsmCellMeasResult, LteCellMeasResult, KCellularWcdmaSelReselCellInfo, EutraFreqInfo,
-    UtraFreqInfo, GsmFreqInfo, KCellularWcdmaTxPower,
-    KCellularGsmScellInfo, KCellularGsmIdleConfig, KCellularGsmGprsConfig,
-    KCellularGsmIdleScellMeasurement, KCellularGsmCsRfMeasurement, KCellularGsmGrrEventMeasCr,
-    GsmNcellMeas, UmtsNcellMeas, LteNcellMeas,
-    KCellularMmCommonInfo, Plmn, KCellularLocationAreaId, RoutingAreaId, KCellularTrackingAreaId,
-    Guti, KCellularMmContext, KCellularGmmContext, KCellularEmmContext,
-    KCellularActivatedBearerContexts, BearerContext, KCellularSimCardFiles, ElementaryFile>;
-// clang-format on
+// Every class of the list of message classes.
+template <class... Classes>
+::testing::Types<Classes...> typesOf(int, Classes*...);
+#define PYX_POINTER(group, Class) , static_cast<Class*>(nullptr)
+using AllMessages = decltype(typesOf(0 PYX_MESSAGE_CLASSES(PYX_POINTER)));
+#undef PYX_POINTER
 
 class TypeNames {
   public:

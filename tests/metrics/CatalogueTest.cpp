@@ -80,6 +80,73 @@ TEST(Store, BeforeAnyMetricEveryDictionaryPropertyIsAbsent) {
     EXPECT_EQ(validator->myCommon(), CommonListHolder{});
 }
 
+TEST(Store, Has31PropertiesInTheirDeclarationOrder) {
+    ASSERT_EQ(MetricValidator::kDictionaryPropertyCount, 31U);
+    const std::vector<std::string> expected = {"myLTERRCStateDict",
+                                               "myLTECDRXConfigDict",
+                                               "myLTESCellInfoDict",
+                                               "myLTESCellMeasDict",
+                                               "myLTESelReselDict",
+                                               "myLTERsrpRsrqSinrDict",
+                                               "myLTECompCarrDict",
+                                               "myLTETxPowerDict",
+                                               "myLTEInterRatMeasDict",
+                                               "myLTEIntraRatMeasDict",
+                                               "myLTECAStatusDict",
+                                               "myLTESecondaryCellMeasDict",
+                                               "myLTEEMMContextDict",
+                                               "myCellularMMCommonInfoDict",
+                                               "myCellularActiveBearerDict",
+                                               "myGMMContextDict",
+                                               "myMMContextDict",
+                                               "myUMTSRRCStateDict",
+                                               "myUMTSRRCConfigDict",
+                                               "myUMTSCellInfoDict",
+                                               "myUMTSCellMeasDict",
+                                               "myUMTSTxPowerDict",
+                                               "myUMTSSelReselDict",
+                                               "myUMTSNbrMeasDict",
+                                               "myGSMScellInfoDict",
+                                               "myGSMIdleConfigInfoDict",
+                                               "myGSMIdleScellMeasDict",
+                                               "myGSMConnRfMeasDict",
+                                               "myGSMNbrMeasDict",
+                                               "myGSMGPRSConfigDict",
+                                               "mySIMFileInfoDict"};
+    std::vector<std::string> names;
+    for (std::size_t i = 0; i < MetricValidator::kDictionaryPropertyCount; ++i) {
+        names.emplace_back(MetricValidator::nameOf(static_cast<Property>(i)));
+    }
+    EXPECT_EQ(names, expected);
+}
+
+TEST(Catalogue, EveryPropertyButTheIgnoredOnesBelongsToADecodedKind) {
+    std::set<std::string_view> decodedInto;
+    for (const MetricKind& kind : metricCatalogue()) {
+        if (kind.decodable()) decodedInto.insert(MetricValidator::nameOf(*kind.property));
+    }
+    std::set<std::string_view> neverWritten;
+    for (std::size_t i = 0; i < MetricValidator::kDictionaryPropertyCount; ++i) {
+        const auto name = MetricValidator::nameOf(static_cast<Property>(i));
+        if (decodedInto.count(name) == 0) neverWritten.insert(name);
+    }
+    EXPECT_EQ(neverWritten, std::set<std::string_view>{"myLTESCellMeasDict"});
+    EXPECT_EQ(findMetricKind(3952165)->property, std::nullopt);
+    EXPECT_EQ(findMetricKind(3986177)->property, Property::myLTESCellMeasDict);
+}
+
+TEST(MetricTag, TableHas31RowsOneForEveryCataloguedKindButTheSecondaryCellMeasurement) {
+    ASSERT_EQ(KBBMetricUtility::kEntries.size(), 31U);
+    std::set<std::uint16_t> untagged;
+    for (const MetricKind& kind : metricCatalogue()) {
+        const auto tag = static_cast<std::uint16_t>(kind.id & 0xFFFF);
+        if (KBBMetricUtility::classNameForTag(tag).empty()) untagged.insert(tag);
+    }
+    EXPECT_EQ(untagged, std::set<std::uint16_t>{0xD317});
+    EXPECT_EQ(KBBMetricUtility::classNameForTag(0x4E25), "KCellularLteRadioLinkFailure");
+    EXPECT_EQ(KBBMetricUtility::classNameForTag(0xD301), "KCellularLteServingCellMeasurement");
+}
+
 TEST(Store, DlbwlookupCode3Gives10AndCodes6AndMinus1GiveNothing) {
     const auto validator = MetricValidator::create(nullptr);
     const auto& table = validator->dlbwlookup();

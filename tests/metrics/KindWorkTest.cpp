@@ -30,7 +30,12 @@ TEST(KindWork, ScellInfoBandwidthsAreHalvedTowardZero) {
     kindwork::lteScellInfo(stored, update);
     EXPECT_EQ(*stored.find("dl_bw"), Value(std::int64_t{50}));
     EXPECT_EQ(*stored.find("ul_bw"), Value(std::int64_t{7}));
-    EXPECT_EQ(update.stagedCount(), 0U);
+    // No list is staged: committing leaves every holder empty.
+    update.commit();
+    EXPECT_EQ(h.lte, LTEListHolder{});
+    EXPECT_EQ(h.umts, UMTSListHolder{});
+    EXPECT_EQ(h.gsm, GSMListHolder{});
+    EXPECT_EQ(h.common, CommonListHolder{});
 }
 
 TEST(KindWork, ScellInfoBandwidthThatIsNotAnIntegerIsLeft) {
@@ -204,7 +209,8 @@ TEST(KindWork, OverflowStopsTheWorkBeforeAnyListIsStaged) {
         {"meas_nbr_utra", list({Dict{{"rscp", Value(std::numeric_limits<std::int64_t>::min())}}})}};
     auto update = h.update();
     EXPECT_THROW(kindwork::lteNbrInterRatCellMeas(stored, update), ConversionOverflow);
-    EXPECT_EQ(update.stagedCount(), 0U);
+    // Nothing was staged either: committing what there is changes nothing.
+    update.commit();
     EXPECT_EQ(h.lte, before);
 }
 

@@ -7,6 +7,7 @@
 #include <iterator>
 #include <string>
 
+#include "core/MetricKindList.h"
 #include "sources/sim/Drive.h"
 
 namespace {
@@ -127,7 +128,11 @@ TEST(DeviceConfig, TheShippedConfigurationListsEveryReportedMetric) {
     std::vector<std::int64_t> ids;
     for (const auto& item : config.metrics) ids.push_back(item.id);
     std::sort(ids.begin(), ids.end());
-    std::vector<std::int64_t> reported = pyx::sim::Drive::reportedMetricIDs();
+    std::vector<std::int64_t> reported;
+#define PYX_REPORTED_ID(constant, id, ...) \
+    if (pyx::sim::Drive::reports(id)) reported.push_back(id);
+    PYX_METRIC_KINDS(PYX_REPORTED_ID)
+#undef PYX_REPORTED_ID
     std::sort(reported.begin(), reported.end());
     EXPECT_EQ(ids, reported);
     EXPECT_FALSE(config.triggers.empty());
