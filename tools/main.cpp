@@ -1,4 +1,5 @@
 // pyxonctl: command-line tools around the metric store.
+#include <string>
 #include <vector>
 
 #include "tools/DecodeCommand.h"
@@ -13,6 +14,7 @@ int main(int argc, char** argv) {
         "\"08fbb0def7d32b12040814101e\"}' | pyxonctl decode",
         "pyxonctl"};
     pyxonctl.require_subcommand(1);
+    pyxonctl.set_version_flag("--version", std::string("pyxonctl ") + PYXON_VERSION);
     std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl)};
 #ifdef PYXON_HAVE_SCREEN_COMMAND
     subcommands.push_back(pyx::addScreenCommand(pyxonctl));
