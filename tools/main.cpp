@@ -7,7 +7,8 @@
 #include "tools/ScreenCommand.h"
 #endif
 
-int main(int argc, char** argv) {
+// An exception that no subcommand expects ends the program through std::terminate, which names it.
+int main(int argc, char** argv) {  // NOLINT(bugprone-exception-escape)
     CLI::App pyxonctl{
         "pyxonctl: tools around Pyxon's metric store.\n"
         "Example: echo '{\"kKeyMetricID\": 3986178, \"kKeyPayload\": "

@@ -256,6 +256,7 @@ bool Drive::reports(std::int64_t metricID) {
 const std::vector<std::int64_t>& Drive::reportedMetricIDs() {
     static const std::vector<std::int64_t> ids = [] {
         std::vector<std::int64_t> out;
+        out.reserve(kReported.size());
         for (const auto& r : kReported) out.push_back(r.metricID);
         return out;
     }();

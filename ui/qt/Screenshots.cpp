@@ -3,8 +3,6 @@
 #include <QImage>
 #include <QTimer>
 
-#include <utility>
-
 #include "core/Log.h"
 #include "ui/PyxViewItems.h"
 
@@ -22,12 +20,9 @@ QString slug(const QString& title) {
 
 }  // namespace
 
-Screenshots::Screenshots(Navigator& navigator, QQuickWindow& window, QDir folder, QObject* parent)
-    : QObject(parent),
-      navigator_(navigator),
-      window_(window),
-      folder_(std::move(folder)),
-      paths_(paths()) {}
+Screenshots::Screenshots(Navigator& navigator, QQuickWindow& window, const QDir& folder,
+                         QObject* parent)
+    : QObject(parent), navigator_(navigator), window_(window), folder_(folder), paths_(paths()) {}
 
 std::vector<QStringList> Screenshots::paths() {
     const PyxViewItems& items = sharedPyxViewItems();

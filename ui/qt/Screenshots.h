@@ -20,7 +20,8 @@ class Screenshots : public QObject {
   public:
     // The file names follow the order of the shots: "01-launch.png", "02-device-info.png",
     // ..., "06-device-info-imsi.png", ...
-    Screenshots(Navigator& navigator, QQuickWindow& window, QDir folder, QObject* parent = nullptr);
+    Screenshots(Navigator& navigator, QQuickWindow& window, const QDir& folder,
+                QObject* parent = nullptr);
 
     // Takes the shots one by one from the event loop; emits finished with 0, or with 1 after
     // printing why a shot could not be taken or saved.
