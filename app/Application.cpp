@@ -1,6 +1,5 @@
 #include "app/Application.h"
 
-#include <pthread.h>
 #include <CLI/CLI.hpp>
 
 #include <atomic>
@@ -14,6 +13,7 @@
 #include "app/AppDelegate.h"
 #include "app/RejectedRecords.h"
 #include "app/RootNavigationController.h"
+#include "app/StopOnSignal.h"
 #include "baseband/VelkWrapper.h"
 #include "baseband/velk/Client.h"
 #include "core/Format.h"
@@ -34,37 +34,6 @@ struct Options {
     std::uint64_t seed = 1;
     double speed = 1.0;
     std::optional<std::string> screenshots;
-};
-
-// SIGINT and SIGTERM are blocked in every thread (set before any thread starts) and taken by
-// one waiting thread, which stops the main queue; the queue then runs what was queued by then.
-class StopOnSignal {
-  public:
-    StopOnSignal() {
-        sigemptyset(&signals_);
-        sigaddset(&signals_, SIGINT);
-        sigaddset(&signals_, SIGTERM);
-        pthread_sigmask(SIG_BLOCK, &signals_, nullptr);
-        waiter_ = std::thread([this] {
-            int signal = 0;
-            sigwait(&signals_, &signal);
-            if (!done_) MainQueue::shared().stop();
-        });
-    }
-    ~StopOnSignal() {
-        done_ = true;
-        // Wakes the waiter's sigwait (the signal is blocked in every thread); it ends nothing.
-        // NOLINTNEXTLINE(bugprone-bad-signal-to-kill-thread)
-        pthread_kill(waiter_.native_handle(), SIGTERM);
-        waiter_.join();
-    }
-    StopOnSignal(const StopOnSignal&) = delete;
-    StopOnSignal& operator=(const StopOnSignal&) = delete;
-
-  private:
-    sigset_t signals_{};
-    std::atomic<bool> done_{false};
-    std::thread waiter_;
 };
 
 int runHeadless(RootNavigationController& root) {
@@ -135,7 +104,7 @@ int runPyxon(int argc, char** argv) {
     }
 
     std::optional<StopOnSignal> stopOnSignal;
-    if (!window) stopOnSignal.emplace();
+    if (!window) stopOnSignal.emplace(MainQueue::shared());
 
     const RejectedRecords rejected(MainQueue::shared());
 

@@ -36,6 +36,9 @@ void RootNavigationController::viewDidLoad() {
 
     if (myMetricValidator) {
         if (const auto& client = myMetricValidator->mySharedVelkInstance()) client->listen();
+    } else {
+        // A tool without a store (pyxonctl listen) listens on its own client.
+        myVelkWrapper->listen();
     }
 
     standardOutput("Querying SIM files");

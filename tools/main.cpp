@@ -3,6 +3,7 @@
 #include <vector>
 
 #include "tools/DecodeCommand.h"
+#include "tools/ListenCommand.h"
 #ifdef PYXON_HAVE_SCREEN_COMMAND
 #include "tools/ScreenCommand.h"
 #endif
@@ -16,7 +17,8 @@ int main(int argc, char** argv) {  // NOLINT(bugprone-exception-escape)
         "pyxonctl"};
     pyxonctl.require_subcommand(1);
     pyxonctl.set_version_flag("--version", std::string("pyxonctl ") + PYXON_VERSION);
-    std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl)};
+    std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl),
+                                             pyx::addListenCommand(pyxonctl)};
 #ifdef PYXON_HAVE_SCREEN_COMMAND
     subcommands.push_back(pyx::addScreenCommand(pyxonctl));
 #endif

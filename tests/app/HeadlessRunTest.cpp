@@ -47,12 +47,20 @@ Child spawn(const std::vector<std::string>& args) {
 class LineCollector {
   public:
     explicit LineCollector(int fd) : thread_([this, fd] { read(fd); }) {}
-    ~LineCollector() { thread_.join(); }
+    ~LineCollector() {
+        if (thread_.joinable()) thread_.join();
+    }
     LineCollector(const LineCollector&) = delete;
     LineCollector& operator=(const LineCollector&) = delete;
 
+    // What has been read so far (the child may still be writing).
     std::vector<std::string> lines() {
         const std::lock_guard lock(mutex_);
+        return lines_;
+    }
+    // Everything the child wrote: waits until its end of the pipe is closed.
+    std::vector<std::string> all() {
+        if (thread_.joinable()) thread_.join();
         return lines_;
     }
 
@@ -153,8 +161,8 @@ TEST(PyxonHeadless, ShowsEveryKindOnTheSimulatedBasebandAndExitsCleanlyOnSigterm
         ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
         ASSERT_TRUE(WIFEXITED(status)) << "ended by signal " << WTERMSIG(status);
         EXPECT_EQ(WEXITSTATUS(status), 0);
-        out = stdoutLines.lines();
-        for (const auto& line : stderrLines.lines())
+        out = stdoutLines.all();
+        for (const auto& line : stderrLines.all())
             EXPECT_EQ(line.find("rejected"), std::string::npos) << line;
     }
     const auto missing = missingLines(out);
@@ -172,7 +180,7 @@ TEST(PyxonOptions, UnknownOptionIsAUsageErrorWithStatusTwo) {
         ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
         ASSERT_TRUE(WIFEXITED(status));
         EXPECT_EQ(WEXITSTATUS(status), 2);
-        err = e.lines();
+        err = e.all();
     }
     ASSERT_FALSE(err.empty());
     EXPECT_NE(err.front().find("no-such-option"), std::string::npos) << err.front();
@@ -190,7 +198,7 @@ TEST(PyxonOptions, VersionAndHelpExitZero) {
             ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
             ASSERT_TRUE(WIFEXITED(status));
             EXPECT_EQ(WEXITSTATUS(status), 0) << option;
-            out = o.lines();
+            out = o.all();
         }
         ASSERT_FALSE(out.empty()) << option;
     }

@@ -1,0 +1,146 @@
+#include "tools/ListenCommand.h"
+
+#include <csignal>
+#include <cstdio>
+#include <iostream>
+#include <memory>
+#include <optional>
+#include <stop_token>
+#include <string>
+#include <thread>
+
+#include "app/Bundle.h"
+#include "app/RootNavigationController.h"
+#include "app/StopOnSignal.h"
+#include "baseband/VelkWrapper.h"
+#include "baseband/VelkWrapperDelegate.h"
+#include "core/Log.h"
+#include "core/MainQueue.h"
+#include "sources/Source.h"
+#include "tools/RecordWriter.h"
+
+namespace pyx {
+namespace {
+
+struct ListenOptions {
+    std::string source = "sim";
+    std::uint64_t seed = 1;
+    double speed = 1.0;
+    std::optional<double> duration;
+    std::optional<std::uint64_t> count;
+};
+
+// Receives the client's events on the main queue and prints the metric ones.
+class EventPrinter : public VelkWrapperDelegate {
+  public:
+    EventPrinter(MainQueue& queue, std::optional<std::uint64_t> count)
+        : queue_(queue), count_(count) {}
+
+    void metricsDidUpdate(const MetricRecord& record) override {
+        if (done_) return;
+        std::string line = recordLine(record);
+        line += '\n';
+        // A reader that went away (a closed pipe) ends the run like a signal would.
+        if (std::fwrite(line.data(), 1, line.size(), stdout) != line.size() ||
+            std::fflush(stdout) != 0) {
+            finish();
+            return;
+        }
+        if (count_ && ++printed_ >= *count_) finish();
+    }
+    void eventsDidUpdate(const MetricRecord&) override {}
+
+  private:
+    void finish() {
+        done_ = true;
+        queue_.stop();
+    }
+
+    MainQueue& queue_;
+    const std::optional<std::uint64_t> count_;
+    std::uint64_t printed_ = 0;
+    bool done_ = false;
+};
+
+int runListen(const ListenOptions& options) {
+    std::optional<sources::SourceSpec> spec;
+    try {
+        spec = sources::parseSourceSpec(options.source);
+    } catch (const sources::SourceSpecError& e) {
+        std::cerr << "pyxonctl listen: " << e.what() << "\n";
+        return 2;
+    }
+    // stdout carries only records; the start-up lines go to stderr.
+    standardOutputSink().redirect(stderr);
+    std::signal(SIGPIPE, SIG_IGN);
+
+    MainQueue& mainQueue = MainQueue::shared();
+    mainQueue.claimCurrentThread();
+    const StopOnSignal stopOnSignal(mainQueue);
+
+    std::shared_ptr<velk::client::Transport> transport;
+    try {
+        transport =
+            sources::makeTransport(sources::SourceOptions{*spec, options.seed, options.speed});
+    } catch (const sources::SourceSpecError& e) {
+        std::cerr << "pyxonctl listen: " << e.what() << "\n";
+        return 2;
+    }
+    velk::client::SetTransportFactory([transport] { return transport; });
+
+    const auto printer = std::make_shared<EventPrinter>(mainQueue, options.count);
+    const auto client = VelkWrapper::create(mainQueue);
+    client->setDelegate(printer);
+    RootNavigationController root(client, nullptr, Bundle::mainBundle());
+    root.viewDidLoad();
+
+    std::jthread timer;
+    if (options.duration) {
+        timer = std::jthread([&mainQueue, seconds = *options.duration](std::stop_token stop) {
+            std::mutex mutex;
+            std::condition_variable_any wake;
+            std::unique_lock lock(mutex);
+            const auto until =
+                std::chrono::steady_clock::now() + std::chrono::duration<double>(seconds);
+            if (!wake.wait_until(lock, stop, until, [] { return false; })) mainQueue.stop();
+        });
+    }
+    mainQueue.run();
+    client->setDelegate({});
+    return 0;
+}
+
+}  // namespace
+
+Subcommand addListenCommand(CLI::App& pyxonctl) {
+    auto options = std::make_shared<ListenOptions>();
+    CLI::App* listen = pyxonctl.add_subcommand(
+        "listen",
+        "Start a source the way the viewer does and print every metric event as one JSON line "
+        "({\"kKeyMetricID\": N, \"kKeyPayload\": \"hex\"}), the format decode and screen read");
+    listen->add_option("--source", options->source, "sim, modem, modem:N or replay:FILE")
+        ->type_name("SPEC")
+        ->capture_default_str();
+    listen->add_option("--seed", options->seed, "Seed of the simulated baseband's drive")
+        ->capture_default_str();
+    listen
+        ->add_option("--speed", options->speed,
+                     "Speed factor of the simulated baseband (2 = events twice as often)")
+        ->check(CLI::PositiveNumber)
+        ->capture_default_str();
+    listen->add_option("--duration", options->duration, "Stop after this many seconds")
+        ->type_name("SECONDS")
+        ->check(CLI::NonNegativeNumber);
+    listen->add_option("--count", options->count, "Stop after this many metric events")
+        ->type_name("N")
+        ->check(CLI::PositiveNumber);
+    listen->footer(std::string(sources::sourceHelp()) +
+                   "\nWithout --duration or --count it runs until SIGINT or SIGTERM; it exits 0.\n"
+                   "Examples:\n"
+                   "  pyxonctl listen --speed 20 --count 100 > drive.jsonl\n"
+                   "  pyxonctl listen --source modem --duration 10 | pyxonctl screen LTE \"Serving "
+                   "Cell Meas\"\n");
+    return Subcommand{listen, [options] { return runListen(*options); }};
+}
+
+}  // namespace pyx
