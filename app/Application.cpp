@@ -2,13 +2,11 @@
 
 #include <CLI/CLI.hpp>
 
-#include <atomic>
 #include <csignal>
 #include <cstdint>
 #include <iostream>
 #include <optional>
 #include <string>
-#include <thread>
 
 #include "app/AppDelegate.h"
 #include "app/RejectedRecords.h"
@@ -20,8 +18,10 @@
 #include "core/Log.h"
 #include "core/MainQueue.h"
 #include "metrics/MetricValidator.h"
+#include "metrics/history/History.h"
 #include "sources/Source.h"
 #ifdef PYXON_HAVE_WINDOW
+#include "ui/ChartScreens.h"
 #include "ui/qt/QtFrontEnd.h"
 #endif
 
@@ -33,8 +33,16 @@ struct Options {
     std::string source = "sim";
     std::uint64_t seed = 1;
     double speed = 1.0;
+    bool loop = false;
+    std::optional<std::string> record;
+    bool append = false;
     std::optional<std::string> screenshots;
+    std::optional<std::string> chart;
 };
+
+// Screenshots are taken after this much simulated time per second, unless --speed says
+// otherwise, so that the charts have long lines.
+constexpr double kScreenshotSpeed = 30;
 
 int runHeadless(RootNavigationController& root) {
     MainQueue& mainQueue = MainQueue::shared();
@@ -62,17 +70,35 @@ int runPyxon(int argc, char** argv) {
     cli.add_option("--seed", options.seed, "Seed of the simulated baseband's drive")
         ->capture_default_str();
     cli.add_option("--speed", options.speed,
-                   "Speed factor of the simulated baseband (2 = events twice as often)")
-        ->check(CLI::PositiveNumber)
+                   "Speed factor: the simulated baseband's events come this many times as often "
+                   "(> 0); a replay divides the recorded timing by it (0 = as fast as the store "
+                   "takes them)")
+        ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
+    cli.add_flag("--loop", options.loop, "Replay: start again at the end of the recording");
+    CLI::Option* record =
+        cli.add_option("--record", options.record,
+                       "Keep every event of this run in FILE (.pyxrec), raw and in order")
+            ->type_name("FILE");
+    cli.add_flag("--append", options.append,
+                 "With --record: add a new session to an existing recording")
+        ->needs(record);
     cli.add_option("--screenshots", options.screenshots,
-                   "Render every screen to PNG files in this folder, then quit")
+                   "Render every screen and chart page to PNG files in this folder, then quit")
         ->type_name("DIR");
+    cli.add_option("--chart", options.chart,
+                   "Open the chart page of the screen GROUP/CATEGORY at start (window only)")
+        ->type_name("GROUP/CATEGORY");
     cli.set_version_flag("--version", std::string("pyxon ") + PYXON_VERSION);
-    cli.footer(std::string(sources::sourceHelp()) +
+    cli.footer(std::string(sources::sourceHelp()) + "\n" + std::string(sources::recordingHelp()) +
                "\nExamples:\n"
                "  pyxon --headless --speed 20\n"
-               "  pyxon --source modem\n");
+               "  pyxon --source modem\n"
+               "  pyxon --source modem --record drive.pyxrec\n"
+               "  pyxon --source replay:drive.pyxrec --speed 4 --loop\n"
+               "  pyxon --chart 'LTE/Serving Cell Meas'\n"
+               "  pyxon --screenshots shots   (simulated time runs 30 times faster unless "
+               "--speed is given)\n");
     try {
         cli.parse(argc, argv);
     } catch (const CLI::CallForHelp& e) {
@@ -102,6 +128,25 @@ int runPyxon(int argc, char** argv) {
         std::cerr << "pyxon: --screenshots needs the window\n";
         return 2;
     }
+    std::optional<std::pair<std::string, std::string>> chart;
+    if (options.chart) {
+        const auto slash = options.chart->find('/');
+        if (slash != std::string::npos)
+            chart.emplace(options.chart->substr(0, slash), options.chart->substr(slash + 1));
+#ifdef PYXON_HAVE_WINDOW
+        if (!chart || !chartForCategory(chart->first + " " + chart->second)) {
+            std::cerr << "pyxon: --chart: \"" << *options.chart
+                      << "\" is not a screen with a chart (e.g. \"LTE/Serving Cell Meas\")\n";
+            return 2;
+        }
+#endif
+        if (!window) {
+            std::cerr << "pyxon: --chart needs the window\n";
+            return 2;
+        }
+    }
+    if (options.screenshots && cli.get_option("--speed")->count() == 0)
+        options.speed = kScreenshotSpeed;
 
     std::optional<StopOnSignal> stopOnSignal;
     if (!window) stopOnSignal.emplace(MainQueue::shared());
@@ -109,9 +154,25 @@ int runPyxon(int argc, char** argv) {
     const RejectedRecords rejected(MainQueue::shared());
 
     std::shared_ptr<velk::client::Transport> transport;
+    std::shared_ptr<recordings::RecordingWriter> recording;
     try {
-        transport = sources::makeTransport(
-            sources::SourceOptions{*sourceSpec, options.seed, options.speed, false});
+        // A replay waits while the events it handed out are not yet taken in by the store.
+        sources::SourceOptions sourceOptions;
+        sourceOptions.spec = *sourceSpec;
+        sourceOptions.seed = options.seed;
+        sourceOptions.speed = options.speed;
+        sourceOptions.loop = options.loop;
+        sourceOptions.backlog = [] {
+            return MainQueue::shared().pending() + VelkWrapper::queue().pending();
+        };
+        transport = sources::makeTransport(sourceOptions);
+        if (options.record) {
+            auto recorded = sources::recordSource(
+                std::move(transport), sourceOptions,
+                sources::RecordOptions{*options.record, options.append, PYXON_VERSION});
+            transport = std::move(recorded.transport);
+            recording = std::move(recorded.writer);
+        }
     } catch (const sources::SourceSpecError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;
@@ -124,12 +185,15 @@ int runPyxon(int argc, char** argv) {
     // Creation order: the client's shared instance, then the store's (which listens and then
     // becomes the delegate), then the start-up sequence once the root view has loaded.
     RootNavigationController root;
+    // The charts' history, fed by the store on every stored arrival.
+    root.myMetricValidator->setHistory(std::make_shared<History>());
 
     int status = 0;
 #ifdef PYXON_HAVE_WINDOW
     if (window) {
         WindowOptions windowOptions;
         windowOptions.screenshotDir = options.screenshots;
+        windowOptions.chart = chart;
         status = runWindow(argc, argv, windowOptions, [&root] { root.viewDidLoad(); });
     } else {
         status = runHeadless(root);
@@ -138,6 +202,8 @@ int runPyxon(int argc, char** argv) {
     status = runHeadless(root);
 #endif
     appDelegate.applicationWillTerminate();
+    // What is still queued for the recording is written before the process ends.
+    if (recording) recording->close();
     return status;
 }
 

@@ -30,6 +30,9 @@ int main(int argc, char** argv) {
         if (!pyx::bench::checkReference(corpus, std::cerr)) return 1;
         pyx::bench::registerCompareBenchmarks(corpus);
         pyx::bench::registerIntakeBenchmarks(corpus);
+#ifdef PYXON_BENCH_RECORDINGS
+        pyx::bench::registerRecordingBenchmarks(corpus);
+#endif
         benchmark::RunSpecifiedBenchmarks();
         benchmark::Shutdown();
     } catch (const pyx::bench::CorpusError& e) {

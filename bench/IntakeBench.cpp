@@ -18,6 +18,7 @@
 #include "core/Log.h"
 #include "core/MainQueue.h"
 #include "metrics/MetricValidator.h"
+#include "metrics/history/History.h"
 #include "ui/PyxViewItems.h"
 #include "ui/SecondLevelViewController.h"
 
@@ -51,12 +52,17 @@ void account(benchmark::State& state, const Subject& subject) {
 }
 
 // Record to stored dictionary: dispatch, decode, dictionary, timestamp text, conversions,
-// holders and the arrival line, on a store of its own.
-void registerIntake(const Subject& subject) {
+// holders and the arrival line, on a store of its own; as "intake/history/..." the store also
+// feeds the charts' history, to compare with "intake/ours/...". (The corpus replays the same
+// times on every pass, so the history starts a new session at each pass, as for a replay.)
+void registerIntake(const Subject& subject, bool withHistory) {
+    const std::string side = withHistory ? "history" : "ours";
     benchmark::RegisterBenchmark(
-        ("intake/ours/" + subject.name).c_str(), [subject](benchmark::State& state) {
+        ("intake/" + side + "/" + subject.name).c_str(),
+        [subject, withHistory](benchmark::State& state) {
             const SilencedSinks silenced;
             const auto validator = MetricValidator::create(nullptr);
+            if (withHistory) validator->setHistory(std::make_shared<History>());
             for (auto _ : state) {
                 for (const CorpusRecord* r : subject.records) {
                     if (!validator->isMetricIDValidWithMetricdict(r->record)) {
@@ -172,7 +178,7 @@ void registerScreen(const std::vector<CorpusRecord>& corpus) {
         const auto categories = items.firstLevelViewItems.find(group);
         if (categories == items.firstLevelViewItems.end()) continue;
         for (const std::string& category : categories->second) {
-            auto screen = std::make_shared<SecondLevelViewController>(validator);
+            auto screen = std::make_shared<SecondLevelViewController>(*validator);
             screen->setFirstSelection(group);
             screen->setSeguedThroughRow(category);
             const std::int64_t cells = answerInFull(*screen);
@@ -199,7 +205,10 @@ void registerScreen(const std::vector<CorpusRecord>& corpus) {
 
 void registerIntakeBenchmarks(const std::vector<CorpusRecord>& corpus) {
     const std::vector<Subject> subjects = subjectsOf(corpus);
-    for (const Subject& subject : subjects) registerIntake(subject);
+    for (const Subject& subject : subjects) registerIntake(subject, false);
+    // With the history: the realistic mix and the whole corpus (the last two subjects).
+    for (std::size_t i = subjects.size() >= 2 ? subjects.size() - 2 : 0; i < subjects.size(); ++i)
+        registerIntake(subjects[i], true);
     registerPath(subjects.back());  // the whole corpus
     registerScreen(corpus);
 }

@@ -26,5 +26,7 @@ struct Subject {
 void registerCompareBenchmarks(const std::vector<CorpusRecord>& corpus);
 // The intake, the whole event path, and the largest category screen.
 void registerIntakeBenchmarks(const std::vector<CorpusRecord>& corpus);
+// Recordings: writing, exporting as JSON Lines, replaying (named "recording/...").
+void registerRecordingBenchmarks(const std::vector<CorpusRecord>& corpus);
 
 }  // namespace pyx::bench

@@ -33,6 +33,11 @@ void SerialQueue::waitIdle() {
     idle_.wait(lock, [this] { return tasks_.empty() && !running_task_; });
 }
 
+std::size_t SerialQueue::pending() const {
+    const std::lock_guard lock(mutex_);
+    return tasks_.size() + (running_task_ ? 1 : 0);
+}
+
 void SerialQueue::loop() {
     std::unique_lock lock(mutex_);
     for (;;) {

@@ -28,12 +28,14 @@ class SerialQueue {
     [[nodiscard]] bool isCurrent() const { return std::this_thread::get_id() == thread_.get_id(); }
     // Blocks until every task posted before this call has run. Not from the queue's own thread.
     void waitIdle();
+    // Tasks posted and not finished yet, the running one included (a measure of backlog).
+    [[nodiscard]] std::size_t pending() const;
 
   private:
     void loop();
 
     const std::string label_;
-    std::mutex mutex_;
+    mutable std::mutex mutex_;
     std::condition_variable wake_;
     std::condition_variable idle_;
     std::deque<Task> tasks_;

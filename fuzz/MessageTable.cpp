@@ -25,6 +25,10 @@ void check(std::span<const std::uint8_t> payload) {
     PBDataReader reader(payload);
     M first;
     const bool read = first.readFrom(reader);
+    if (read == reader.hasError()) broken(name, "a refusal does not say why, or a read does");
+    if (!read && reader.error()->offset() > payload.size()) {
+        broken(name, "a refusal points past the payload");
+    }
     const Dict shown = first.dictionaryRepresentation();
     const M copy = first.copy();
     if (!copy.isEqual(first)) broken(name, "a copy differs from its original");

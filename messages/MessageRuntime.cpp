@@ -78,57 +78,86 @@ void copyScalar(const void* from, void* into, const FieldDescriptor& f) {
     }
 }
 
-// Reads one value of a repeated scalar (a varint, zigzag-decoded for sint32) and appends it.
-void appendListValue(void* message, const FieldDescriptor& f, std::uint64_t v) {
-    if (f.kind == FieldKind::UInt32List) {
-        at<PBRepeatedUInt32>(message, f).push_back(static_cast<std::uint32_t>(v));
-    } else {
-        at<PBRepeatedInt32>(message, f).push_back(decodeZigZag32(static_cast<std::uint32_t>(v)));
-    }
-}
-
-bool readNested(const SubMessageOps& ops, void* nested, PBDataReader& reader) {
-    PBDataReaderMark mark;
-    if (!PBReaderPlaceMark(reader, mark)) return false;
-    if (!readMessage(ops.descriptor(), nested, reader)) return false;
-    PBReaderRecallMark(reader, mark);
-    return true;
-}
-
-// The values of a packed record, up to the reader's limit or an error (a value that could not be
-// read is appended as 0, as readVarint gives it). The cursor is kept in locals for the loop:
-// lists of a thousand values are common enough to matter.
+// The values of a packed list, read by a reader of their own over the list's bytes, up to its
+// end or a truncated varint (appended as 0, as a truncated varint reads). The cursor is kept in
+// locals for the loop: lists of a thousand values are common enough to matter.
 template <class List, class Convert>
-void readPackedValues(List& list, PBDataReader& reader, Convert convert) {
-    const std::uint8_t* const bytes = reader.bytes();
-    const std::size_t limit = reader.length();
-    std::size_t pos = reader.position();
+void readPackedValues(List& list, PBDataReader& packed, Convert convert) {
+    const std::uint8_t* const bytes = packed.bytes();
+    const std::size_t limit = packed.length();
+    std::size_t pos = packed.position();
     bool error = false;
-    // Each value takes at least one byte: the record's length bounds the count.
-    list.reserve(list.size() + (limit - pos));
-    while (pos < limit && !error) list.push_back(convert(decodeVarint(bytes, pos, limit, error)));
-    reader.setPosition(pos);
-    if (error) reader.setError();
+    // Each value takes at least one byte: the record's length bounds the count. The values are
+    // written through a pointer into room made up front, and the list cut to what was read.
+    const std::size_t before = list.size();
+    list.resize(before + (limit - pos));
+    auto* out = list.data() + before;
+    while (pos < limit && !error) *out++ = convert(decodeVarint(bytes, pos, limit, error));
+    list.resize(static_cast<std::size_t>(out - list.data()));
+    packed.setPosition(pos);
+    if (error) packed.fail(DecodeError::Reason::TruncatedVarint, pos);
 }
 
-bool readRepeatedScalar(void* message, const FieldDescriptor& f, std::uint8_t wireType,
-                        PBDataReader& reader) {
+// The value of a list element from its varint (function objects, so that the packed loop
+// inlines them).
+constexpr auto asUInt32 = [](std::uint64_t v) { return static_cast<std::uint32_t>(v); };
+constexpr auto asSInt32 = [](std::uint64_t v) {
+    return decodeZigZag32(static_cast<std::uint32_t>(v));
+};
+
+// A repeated scalar: a packed list when it comes length-delimited, otherwise one value.
+template <class List, class Convert>
+void readRepeatedScalar(List& list, std::uint8_t wireType, PBDataReader& reader, Convert convert) {
     if (wireType != kWireLengthDelimited) {
-        appendListValue(message, f, reader.readVarint());
-        return true;
+        list.push_back(convert(reader.readVarint()));
+        return;
     }
-    PBDataReaderMark mark;
-    if (!PBReaderPlaceMark(reader, mark)) return false;
-    if (f.kind == FieldKind::UInt32List) {
-        readPackedValues(at<PBRepeatedUInt32>(message, f), reader,
-                         [](std::uint64_t v) { return static_cast<std::uint32_t>(v); });
-    } else {
-        readPackedValues(at<PBRepeatedInt32>(message, f), reader, [](std::uint64_t v) {
-            return decodeZigZag32(static_cast<std::uint32_t>(v));
-        });
+    const auto range = reader.readDelimited();
+    if (!range) return;
+    PBDataReader packed = reader.subReader(*range);
+    readPackedValues(list, packed, convert);
+    reader.resumeAfter(packed);
+}
+
+// A nested record, read by a reader of its own over the record's bytes into the message that
+// the caller has already stored (a bad length leaves it in place, empty).
+void readNested(const SubMessageOps& ops, void* nested, PBDataReader& reader) {
+    const auto range = reader.readDelimited();
+    if (!range) return;
+    PBDataReader record = reader.subReader(*range);
+    readMessage(ops.descriptor(), nested, record);
+    reader.resumeAfter(record);
+}
+
+// Every field that is not a plain scalar, on the reader: the length-delimited kinds and the
+// repeated scalars. A failure is left in the reader. Kept out of the reader loop, whose plain
+// scalars are the common case.
+[[gnu::noinline]] void readObjectField(void* message, const FieldDescriptor& f,
+                                       std::uint8_t wireType, std::uint64_t& has,
+                                       PBDataReader& reader) {
+    switch (f.kind) {
+        case FieldKind::Data:
+            at<std::optional<Bytes>>(message, f) = PBReaderReadData(reader);
+            break;
+        case FieldKind::String:
+            at<std::optional<std::string>>(message, f) = PBReaderReadString(reader);
+            break;
+        case FieldKind::Message:
+            readNested(*f.sub, f.sub->makeNew(slot(message, f)), reader);
+            break;
+        case FieldKind::MessageList:
+            has |= std::uint64_t{1} << f.bit;
+            readNested(*f.sub, f.sub->appendNew(slot(message, f)), reader);
+            break;
+        case FieldKind::UInt32List:
+            readRepeatedScalar(at<PBRepeatedUInt32>(message, f), wireType, reader, asUInt32);
+            break;
+        case FieldKind::SInt32List:
+            readRepeatedScalar(at<PBRepeatedInt32>(message, f), wireType, reader, asSInt32);
+            break;
+        default:
+            break;
     }
-    PBReaderRecallMark(reader, mark);
-    return true;
 }
 
 std::uint64_t hashBytes(const void* data, std::size_t size) {
@@ -197,19 +226,8 @@ bool readMessage(const MessageDescriptor& d, void* message, PBDataReader& reader
     bool error = reader.hasError();
     std::uint64_t has = hasBits(d, message);
 
-    const auto handOver = [&] { reader.setPosition(pos); };
-    const auto takeBack = [&] {
-        pos = reader.position();
-        error = reader.hasError();
-    };
-    const auto finish = [&](bool ok) {
-        hasBits(d, message) = has;
-        reader.setPosition(pos);
-        if (error) reader.setError();
-        return ok;
-    };
-
     while (pos < limit && !error) {
+        const std::size_t keyPosition = pos;
         const std::uint64_t key = decodeVarint(bytes, pos, limit, error);
         const auto wireType = static_cast<std::uint8_t>(key & 7);
         const auto tag = static_cast<std::uint16_t>(key >> 3);
@@ -222,17 +240,10 @@ bool readMessage(const MessageDescriptor& d, void* message, PBDataReader& reader
             continue;
         }
         const std::uint8_t index = tag < tagCount ? tagIndex[tag] : MessageDescriptor::kNoField;
-        if (index == MessageDescriptor::kNoField) {
-            handOver();
-            const bool skipped = PBReaderSkipValueWithTag(reader, tag, wireType);
-            takeBack();
-            if (!skipped) return finish(false);
-            continue;
-        }
-        const FieldDescriptor& f = fields[index];
-        if (f.isScalar()) {
+        if (index != MessageDescriptor::kNoField && fields[index].isScalar()) {
             // The common case, kept free of a jump table: a varint whatever the wire type,
             // stored at the field's width.
+            const FieldDescriptor& f = fields[index];
             const std::uint64_t v = decodeVarint(bytes, pos, limit, error);
             has |= std::uint64_t{1} << f.bit;
             char* const p = base + f.offset;
@@ -248,34 +259,21 @@ bool readMessage(const MessageDescriptor& d, void* message, PBDataReader& reader
             }
             continue;
         }
-        handOver();
-        bool ok = true;
-        switch (f.kind) {
-            case FieldKind::Data:
-                at<std::optional<Bytes>>(message, f) = PBReaderReadData(reader);
-                break;
-            case FieldKind::String:
-                at<std::optional<std::string>>(message, f) = PBReaderReadString(reader);
-                break;
-            case FieldKind::Message:
-                // Stored before its length is checked: a bad length leaves it in place.
-                ok = readNested(*f.sub, f.sub->makeNew(slot(message, f)), reader);
-                break;
-            case FieldKind::MessageList:
-                has |= std::uint64_t{1} << f.bit;
-                ok = readNested(*f.sub, f.sub->appendNew(slot(message, f)), reader);
-                break;
-            case FieldKind::UInt32List:
-            case FieldKind::SInt32List:
-                ok = readRepeatedScalar(message, f, wireType, reader);
-                break;
-            default:
-                break;
+        reader.setPosition(pos);
+        if (index == MessageDescriptor::kNoField) {
+            PBReaderSkipValueWithTag(reader, tag, wireType, keyPosition);
+        } else {
+            readObjectField(message, fields[index], wireType, has, reader);
         }
-        takeBack();
-        if (!ok) return finish(false);
+        pos = reader.position();
+        error = reader.hasError();
     }
-    return finish(!error);
+    hasBits(d, message) = has;
+    reader.setPosition(pos);
+    // A varint read on the local cursor leaves the position at its first byte when it runs
+    // past the end: that is where the failure is.
+    if (error) reader.fail(DecodeError::Reason::TruncatedVarint, pos);
+    return !error;
 }
 
 void writeMessage(const MessageDescriptor& d, const void* message, PBDataWriter& writer) {

@@ -4,17 +4,16 @@
 
 namespace pyx {
 
-struct PBDataReaderAccess {
-    static std::size_t& length(PBDataReader& r) { return r.length_; }
-    static std::size_t& pos(PBDataReader& r) { return r.pos_; }
-};
+using Reason = DecodeError::Reason;
 
 std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
                                bool& error) {
+    const std::size_t start = pos;
     std::uint64_t value = 0;
     for (unsigned i = 0; i < 10; ++i) {
         if (pos >= limit) {
             error = true;
+            pos = start;
             return 0;
         }
         const std::uint8_t byte = bytes[pos++];
@@ -24,42 +23,7 @@ std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std:
     return 0;
 }
 
-bool PBDataReader::skip(std::size_t n) {
-    if (n > remaining()) {
-        error_ = true;
-        return false;
-    }
-    pos_ += n;
-    return true;
-}
-
-bool PBReaderPlaceMark(PBDataReader& reader, PBDataReaderMark& mark) {
-    const std::uint64_t size = reader.readVarint();
-    if (reader.hasError() || size > reader.remaining()) return false;
-    mark.length = reader.length();
-    PBDataReaderAccess::length(reader) = reader.position() + static_cast<std::size_t>(size);
-    return true;
-}
-
-void PBReaderRecallMark(PBDataReader& reader, const PBDataReaderMark& mark) {
-    PBDataReaderAccess::length(reader) = mark.length;
-}
-
 namespace {
-
-// The bytes of a length-delimited value, or nullptr (error flag set) when it does not fit.
-const std::uint8_t* takeDelimited(PBDataReader& reader, std::size_t& size) {
-    const std::uint64_t n = reader.readVarint();
-    if (reader.hasError()) return nullptr;
-    if (n > reader.remaining()) {
-        reader.setError();
-        return nullptr;
-    }
-    size = static_cast<std::size_t>(n);
-    const std::uint8_t* start = reader.bytes() + reader.position();
-    PBDataReaderAccess::pos(reader) += size;
-    return start;
-}
 
 bool validUtf8(const std::uint8_t* p, std::size_t n) {
     std::size_t i = 0;
@@ -100,67 +64,79 @@ bool validUtf8(const std::uint8_t* p, std::size_t n) {
 }  // namespace
 
 std::optional<Bytes> PBReaderReadData(PBDataReader& reader) {
-    std::size_t size = 0;
-    const std::uint8_t* start = takeDelimited(reader, size);
-    if (start == nullptr) return std::nullopt;
-    return Bytes(start, start + size);
+    const auto value = reader.readDelimited();
+    if (!value) return std::nullopt;
+    return Bytes(value->begin(), value->end());
 }
 
 std::optional<std::string> PBReaderReadString(PBDataReader& reader) {
-    std::size_t size = 0;
-    const std::uint8_t* start = takeDelimited(reader, size);
-    if (start == nullptr || !validUtf8(start, size)) return std::nullopt;
-    return std::string(reinterpret_cast<const char*>(start), size);
+    const auto value = reader.readDelimited();
+    if (!value || !validUtf8(value->data(), value->size())) return std::nullopt;
+    return std::string(reinterpret_cast<const char*>(value->data()), value->size());
 }
 
 namespace {
 
-// Skips a value that is not a group; false for wire types 3, 4, 6 and 7.
-bool skipPlain(PBDataReader& reader, std::uint8_t wireType) {
+// Skips a fixed-width value of n bytes.
+bool skipFixed(PBDataReader& reader, std::size_t n) {
+    if (n > reader.remaining()) {
+        reader.fail(Reason::TruncatedFixed, reader.position());
+        return false;
+    }
+    reader.setPosition(reader.position() + n);
+    return true;
+}
+
+// Skips a value that is not a group; false for wire types 3, 4, 6 and 7 (only 6 and 7 are
+// recorded here: the caller knows what a group key means where it stands).
+bool skipPlain(PBDataReader& reader, std::uint8_t wireType, std::size_t keyPosition) {
     switch (wireType) {
-        case 0:
+        case kWireVarint:
             reader.readVarint();
             return !reader.hasError();
-        case 1:
-            return reader.skip(8);
-        case 2: {
-            const std::uint64_t n = reader.readVarint();
-            if (reader.hasError()) return false;
-            if (n > reader.remaining()) {
-                reader.setError();
-                return false;
-            }
-            return reader.skip(static_cast<std::size_t>(n));
-        }
-        case 5:
-            return reader.skip(4);
+        case kWireFixed64:
+            return skipFixed(reader, 8);
+        case kWireLengthDelimited:
+            return reader.readDelimited().has_value();
+        case kWireFixed32:
+            return skipFixed(reader, 4);
         default:
+            reader.fail(Reason::UnknownWireType, keyPosition);
             return false;
     }
 }
 
 }  // namespace
 
-bool PBReaderSkipValueWithTag(PBDataReader& reader, std::uint32_t tag, std::uint8_t wireType) {
-    if (wireType != 3) return skipPlain(reader, wireType);
+bool PBReaderSkipValueWithTag(PBDataReader& reader, std::uint32_t tag, std::uint8_t wireType,
+                              std::size_t keyPosition) {
+    if (wireType != kWireStartGroup) return skipPlain(reader, wireType, keyPosition);
     // A group: skip its fields up to the end-of-group key with the same tag. Groups nest; the
-    // open tags are kept on a heap stack so that deep nesting cannot exhaust the call stack.
-    std::vector<std::uint32_t> open{tag};
+    // open groups are kept on a heap stack so that deep nesting cannot exhaust the call stack.
+    struct OpenGroup {
+        std::uint32_t tag;
+        std::size_t keyPosition;
+    };
+    std::vector<OpenGroup> open{{tag, keyPosition}};
     while (!open.empty()) {
         if (!reader.hasMoreData()) {
-            reader.setError();
+            reader.fail(Reason::UnterminatedGroup, open.back().keyPosition);
             return false;
         }
+        const std::size_t innerKeyPosition = reader.position();
         const std::uint64_t key = reader.readVarint();
         if (reader.hasError()) return false;
         const auto innerWire = static_cast<std::uint8_t>(key & 7);
         const auto innerTag = static_cast<std::uint32_t>((key >> 3) & 0xFFFF);
-        if (innerWire == 4) {
-            if (innerTag != open.back()) return false;
+        if (innerWire == kWireEndGroup) {
+            if (innerTag != open.back().tag) {
+                reader.fail(Reason::UnmatchedEndGroup, innerKeyPosition);
+                return false;
+            }
             open.pop_back();
-        } else if (innerWire == 3) {
-            open.push_back(innerTag);
-        } else if (!skipPlain(reader, innerWire)) {
+        } else if (innerWire == kWireStartGroup) {
+            open.push_back({innerTag, innerKeyPosition});
+        } else if (!skipPlain(reader, innerWire, innerKeyPosition)) {
             return false;
         }
     }

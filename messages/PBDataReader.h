@@ -1,6 +1,7 @@
-// The input cursor of the wire decoder: bytes, a length (the current limit), a position and a
-// sticky error flag, with the length-delimited value readers and the limit marks that nested
-// records use.
+// The input cursor of the wire decoder: bytes, a length (the end of the record being read), a
+// position and a sticky failure (the first DecodeError met). Each wire type's reading is here,
+// written once: varints, length-delimited values (also as a reader of their own, for nested
+// records and packed lists), fixed-width values and groups (skipped).
 #pragma once
 
 #include <cstddef>
@@ -10,6 +11,8 @@
 #include <string>
 
 #include "core/Value.h"
+#include "messages/DecodeError.h"
+#include "messages/WireType.h"
 
 namespace pyx {
 
@@ -21,42 +24,62 @@ class PBDataReader {
     explicit PBDataReader(Bytes&&) = delete;
 
     [[nodiscard]] const std::uint8_t* bytes() const { return bytes_; }
-    // The current limit: the end of the data, or of the nested record being read.
+    // The end of the record this reader reads.
     [[nodiscard]] std::size_t length() const { return length_; }
     [[nodiscard]] std::size_t position() const { return pos_; }
-    [[nodiscard]] bool hasError() const { return error_; }
+    [[nodiscard]] bool hasError() const { return error_.has_value(); }
     [[nodiscard]] bool hasMoreData() const { return pos_ < length_ && !error_; }
     [[nodiscard]] std::size_t remaining() const { return length_ - pos_; }
+    // The first failure, if any; its offset counts from the start of the outermost payload.
+    [[nodiscard]] const std::optional<DecodeError>& error() const { return error_; }
 
-    void setError() { error_ = true; }
+    // Records a failure of the item whose first byte is at position (of this reader); a
+    // failure already recorded is kept.
+    void fail(DecodeError::Reason reason, std::size_t position) {
+        if (!error_) error_ = DecodeError(reason, origin_ + position);
+    }
 
-    // A base-128 varint, least significant group first. Reading past the limit sets the
-    // error flag and gives 0; ten bytes without a final byte give 0 (the ten are consumed).
+    // A base-128 varint, least significant group first. Reading past the end records a
+    // truncated varint and gives 0; ten bytes without a final byte give 0 (the ten are
+    // consumed).
     std::uint64_t readVarint();
 
     // For a decoder that keeps the position in a local while it reads plain values.
     void setPosition(std::size_t position) { pos_ = position; }
 
-    // Moves the position forward by n bytes; past the limit it sets the error flag instead.
-    bool skip(std::size_t n);
+    // A length-delimited value: its length, then that many bytes, which are passed over.
+    // Nothing, with the failure recorded, when the length cannot be read or runs past the end.
+    inline std::optional<std::span<const std::uint8_t>> readDelimited();
 
-    // The limit marks of nested records (used through PBReaderPlaceMark/PBReaderRecallMark).
-    friend struct PBDataReaderAccess;
+    // A reader over bytes this reader holds (a value from readDelimited): a nested record or a
+    // packed list is read by a reader of its own, whose failures keep the payload's offsets.
+    [[nodiscard]] PBDataReader subReader(std::span<const std::uint8_t> range) const {
+        PBDataReader sub(range);
+        sub.origin_ = origin_ + static_cast<std::size_t>(range.data() - bytes_);
+        return sub;
+    }
+    // Takes back a finished sub-reader: reading goes on from where it stopped (the end of its
+    // range, or earlier at an end-of-group key), and its failure becomes this reader's.
+    void resumeAfter(const PBDataReader& sub) {
+        pos_ = static_cast<std::size_t>(sub.bytes_ - bytes_) + sub.pos_;
+        if (sub.error_ && !error_) error_ = sub.error_;
+    }
 
   private:
-    std::uint64_t readVarintSlow();
-
     const std::uint8_t* bytes_;
     std::size_t length_;
     std::size_t pos_ = 0;
-    bool error_ = false;
+    std::size_t origin_ = 0;  // where bytes_[0] is in the outermost payload
+    std::optional<DecodeError> error_;
 };
 
 // The varint decoder behind PBDataReader::readVarint, on a position and limit held by the
-// caller: one- and two-byte values (keys, most field values) take no loop.
+// caller. A varint that runs past the limit sets error, gives 0 and leaves pos at its first
+// byte (where the failure is reported).
 std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
                                bool& error);
 
+// One- and two-byte values (keys, most field values) take no loop.
 inline std::uint64_t decodeVarint(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
                                   bool& error) {
     if (limit - pos >= 2) {
@@ -77,30 +100,36 @@ inline std::uint64_t decodeVarint(const std::uint8_t* bytes, std::size_t& pos, s
 }
 
 inline std::uint64_t PBDataReader::readVarint() {
-    return decodeVarint(bytes_, pos_, length_, error_);
+    bool truncated = false;
+    const std::uint64_t value = decodeVarint(bytes_, pos_, length_, truncated);
+    if (truncated) fail(DecodeError::Reason::TruncatedVarint, pos_);
+    return value;
 }
 
-// The outer limit saved while a nested record is read.
-struct PBDataReaderMark {
-    std::size_t length = 0;
-};
+inline std::optional<std::span<const std::uint8_t>> PBDataReader::readDelimited() {
+    const std::size_t start = pos_;
+    const std::uint64_t size = readVarint();
+    if (error_) return std::nullopt;
+    if (size > remaining()) {
+        fail(DecodeError::Reason::LengthPastEnd, start);
+        return std::nullopt;
+    }
+    const std::span<const std::uint8_t> value(bytes_ + pos_, static_cast<std::size_t>(size));
+    pos_ += value.size();
+    return value;
+}
 
-// Reads a length; when it fits before the limit, saves the limit in mark, sets the limit to the
-// end of that many bytes and answers true. A length running past the limit answers false (and
-// a length that could not be read sets the error flag).
-bool PBReaderPlaceMark(PBDataReader& reader, PBDataReaderMark& mark);
-// Restores the limit saved by PBReaderPlaceMark.
-void PBReaderRecallMark(PBDataReader& reader, const PBDataReaderMark& mark);
-
-// A length-delimited value as bytes; nothing (and the error flag) when it runs past the limit.
+// A length-delimited value as bytes; nothing (failure recorded) when it runs past the end.
 std::optional<Bytes> PBReaderReadData(PBDataReader& reader);
-// A length-delimited value as UTF-8 text; nothing when it runs past the limit (error flag set)
-// or is not valid UTF-8 (no error: the field is simply absent, as an undecodable text is).
+// A length-delimited value as UTF-8 text; nothing when it runs past the end (failure recorded)
+// or is not valid UTF-8 (no failure: the field is simply absent, as an undecodable text is).
 std::optional<std::string> PBReaderReadString(PBDataReader& reader);
 
-// Skips one value of the given wire type (a group up to its matching end). False for an
-// unknown wire type, an unmatched end of group, or a value running past the limit.
-bool PBReaderSkipValueWithTag(PBDataReader& reader, std::uint32_t tag, std::uint8_t wireType);
+// Skips one value of the given wire type, whose key began at keyPosition (a group up to its
+// matching end). False, with the failure recorded, for an unknown wire type, an unmatched end
+// of group, a group without its end or a value running past the end.
+bool PBReaderSkipValueWithTag(PBDataReader& reader, std::uint32_t tag, std::uint8_t wireType,
+                              std::size_t keyPosition);
 
 // Zigzag decoding of a 32-bit value.
 constexpr std::int32_t decodeZigZag32(std::uint32_t n) {

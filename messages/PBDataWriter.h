@@ -7,6 +7,7 @@
 #include <string>
 
 #include "core/Value.h"
+#include "messages/WireType.h"
 
 namespace pyx {
 
@@ -37,15 +38,6 @@ class PBDataWriter {
 
 // The tag that writes a value without its key.
 inline constexpr std::uint32_t kNoTag = 0xFFFFFFFF;
-
-enum WireType : std::uint8_t {
-    kWireVarint = 0,
-    kWireFixed64 = 1,
-    kWireLengthDelimited = 2,
-    kWireStartGroup = 3,
-    kWireEndGroup = 4,
-    kWireFixed32 = 5,
-};
 
 inline void PBDataWriterWriteKey(PBDataWriter& writer, std::uint32_t tag, WireType wireType) {
     if (tag != kNoTag) writer.writeVarint((static_cast<std::uint64_t>(tag) << 3) | wireType);

@@ -9,10 +9,11 @@ namespace pyx {
 namespace {
 
 template <class Message>
-std::optional<Dict> decodeAs(std::span<const std::uint8_t> payload) {
-    auto message = Message::initWithData(payload);
-    if (!message) return std::nullopt;
-    return message->dictionaryRepresentation();
+DecodeResult decodeAs(std::span<const std::uint8_t> payload) {
+    PBDataReader reader(payload);
+    Message message;
+    if (!message.readFrom(reader)) return *reader.error();
+    return message.dictionaryRepresentation();
 }
 
 using P = MetricValidator::DictionaryProperty;

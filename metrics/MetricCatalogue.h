@@ -7,15 +7,18 @@
 #include <optional>
 #include <span>
 #include <string_view>
+#include <variant>
 
+#include "messages/DecodeError.h"
 #include "metrics/KindWork.h"
 #include "metrics/MetricValidator.h"
 
 namespace pyx {
 
-// The dictionary form of a payload decoded with one message class, or nothing when the
-// class refuses the bytes.
-using DecodeFunction = std::optional<Dict> (*)(std::span<const std::uint8_t> payload);
+// The dictionary form of a payload decoded with one message class, or why the class refuses
+// the bytes.
+using DecodeResult = std::variant<Dict, DecodeError>;
+using DecodeFunction = DecodeResult (*)(std::span<const std::uint8_t> payload);
 
 struct MetricKind {
     std::int64_t id;

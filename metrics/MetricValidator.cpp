@@ -3,10 +3,12 @@
 #include <array>
 #include <cstdio>
 #include <mutex>
+#include <variant>
 
 #include "core/Log.h"
 #include "metrics/MetricCatalogue.h"
 #include "metrics/TimestampText.h"
+#include "metrics/history/History.h"
 
 namespace pyx {
 
@@ -99,11 +101,12 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     if (payload == nullptr || !payload->isBytes()) {
         throw MetricRejected(id, payload == nullptr ? "no payload" : "the payload is not data");
     }
-    std::optional<Dict> stored = kind->decode(payload->asBytes());
-    if (!stored) {
-        throw MetricRejected(id,
-                             "the payload does not decode as " + std::string(kind->messageClass));
+    DecodeResult decoded = kind->decode(payload->asBytes());
+    if (const auto* error = std::get_if<DecodeError>(&decoded)) {
+        throw MetricRejected(
+            id, "does not decode as " + std::string(kind->messageClass) + ": " + error->text());
     }
+    std::optional<Dict> stored = std::move(std::get<Dict>(decoded));
 
     Value* timestamp = stored->find("timestamp");
     if (timestamp == nullptr || !timestamp->isNumber()) {
@@ -147,6 +150,7 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     update.commit();
 
     const auto& now = self.dictionary(property);
+    if (self.history_ && now) self.history_->record(property, *now, milliseconds);
     std::string& line = self.arrivalLine_;
     line.assign(kind->logPrefix);
     if (now) appendDescription(line, *now);

@@ -19,6 +19,8 @@
 
 namespace pyx {
 
+class History;
+
 // A record the intake cannot take: no metric ID, an undecodable payload, no numeric
 // timestamp, an overflowing conversion. The store is left exactly as it was.
 class MetricRejected : public std::runtime_error {
@@ -156,6 +158,14 @@ class MetricValidator : public VelkWrapperDelegate,
         std::string_view name);
     [[nodiscard]] static std::string_view nameOf(DictionaryProperty p);
 
+    // The history of the measured quantities, fed on every stored arrival; none by default.
+    [[nodiscard]] const std::shared_ptr<History>& history() const {
+        return history_;
+    }
+    void setHistory(std::shared_ptr<History> history) {
+        history_ = std::move(history);
+    }
+
     // LTE bandwidth code to MHz.
     [[nodiscard]] const std::map<std::int32_t, float>& dlbwlookup() const {
         return dlbwlookup_;
@@ -183,6 +193,7 @@ class MetricValidator : public VelkWrapperDelegate,
     CommonListHolder myCommon_;
     std::optional<DisplayDictionary> dictionaries_[kDictionaryPropertyCount];
     std::map<std::int32_t, float> dlbwlookup_;
+    std::shared_ptr<History> history_;
     // The arrival line of the record being taken; kept so that its capacity is reused.
     std::string arrivalLine_;
 };

@@ -3,7 +3,9 @@
 // hand the transport factory to velk::client::SetTransportFactory.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <stdexcept>
@@ -11,6 +13,7 @@
 #include <string_view>
 
 #include "baseband/velk/Transport.h"
+#include "recordings/RecordingWriter.h"
 
 namespace pyx::sources {
 
@@ -39,6 +42,11 @@ struct SourceOptions {
     std::uint64_t seed = 1;  // sim
     double speed = 1.0;      // sim: time runs this much faster; replay: 0 = as fast as taken
     bool loop = false;       // replay: start again at the end
+    // replay: events handed out and not yet taken in by the store, so that a fast replay
+    // waits for it; none: the shared main queue's pending tasks.
+    std::function<std::size_t()> backlog;
+    // replay: called once, on the replay's thread, when a recording without loop has ended.
+    std::function<void()> onEnd;
 };
 
 // The transport of a source. Throws SourceSpecError for options that do not fit the source
@@ -46,7 +54,29 @@ struct SourceOptions {
 // line that names what is wrong.
 [[nodiscard]] std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& options);
 
+// --record FILE [--append]: where the events of the run are kept.
+struct RecordOptions {
+    std::string file;
+    bool append = false;         // add a session to an existing recording
+    std::string programVersion;  // written into the recording's session
+};
+
+// A transport that delivers what source delivers and writes every event to a recording as well
+// (started at once, on a thread of its own). The session notes options' source text, and its
+// seed and speed where they apply. The caller closes the writer before the process ends.
+// Throws SourceSpecError with one line naming the file (it exists and no append, it is a
+// directory, it is not a recording).
+struct RecordedSource {
+    std::shared_ptr<velk::client::Transport> transport;
+    std::shared_ptr<recordings::RecordingWriter> writer;
+};
+[[nodiscard]] RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
+                                          const SourceOptions& options,
+                                          const RecordOptions& record);
+
 // The help text that explains the sources, with an example each; shared by pyxon and pyxonctl.
 [[nodiscard]] std::string_view sourceHelp();
+// The help text that explains --record and --append, with examples; shared likewise.
+[[nodiscard]] std::string_view recordingHelp();
 
 }  // namespace pyx::sources

@@ -1,7 +1,14 @@
+#include <unistd.h>
+
 #include <charconv>
+#include <climits>
 #include <string>
 
+#include "core/MainQueue.h"
+#include "recordings/RecordingError.h"
+#include "recordings/RecordingTransport.h"
 #include "sources/Source.h"
+#include "sources/replay/ReplayTransport.h"
 #include "sources/sim/SimulatedBaseband.h"
 
 namespace pyx::sources {
@@ -55,10 +62,45 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
             throw SourceSpecError("--source " + options.spec.text +
                                   ": this build has no ModemManager source");
         case SourceSpec::Kind::Replay:
-            throw SourceSpecError("--source " + options.spec.text +
-                                  ": this build has no replay source");
+            try {
+                replay::ReplayTransport::Options replayOptions;
+                replayOptions.file = options.spec.file;
+                replayOptions.speed = options.speed;
+                replayOptions.loop = options.loop;
+                replayOptions.onEnd = options.onEnd;
+                replayOptions.backlog = options.backlog ? options.backlog : [] {
+                    return MainQueue::shared().pending();
+                };
+                return std::make_shared<replay::ReplayTransport>(std::move(replayOptions));
+            } catch (const recordings::RecordingError& e) {
+                throw SourceSpecError(std::string("--source replay: ") + e.what());
+            } catch (const std::invalid_argument& e) {
+                throw SourceSpecError(e.what());
+            }
     }
     throw SourceSpecError("--source " + options.spec.text + ": unknown source");
+}
+
+RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
+                            const SourceOptions& options, const RecordOptions& record) {
+    recordings::RecordingWriter::Options writer;
+    writer.path = record.file;
+    writer.append = record.append;
+    writer.session.programVersion = record.programVersion;
+    writer.session.source = options.spec.text;
+    if (options.spec.kind == SourceSpec::Kind::Sim)
+        writer.session.seed = static_cast<std::int64_t>(options.seed);
+    if (options.spec.kind != SourceSpec::Kind::Modem) writer.session.speed = options.speed;
+    char host[HOST_NAME_MAX + 1] = {};
+    if (gethostname(host, sizeof host - 1) == 0) writer.session.host = host;
+    try {
+        auto recording = std::make_shared<recordings::RecordingWriter>(std::move(writer));
+        auto transport =
+            std::make_shared<recordings::RecordingTransport>(std::move(source), recording);
+        return RecordedSource{std::move(transport), std::move(recording)};
+    } catch (const recordings::RecordingError& e) {
+        throw SourceSpecError(std::string("--record ") + e.what());
+    }
 }
 
 std::string_view sourceHelp() {
@@ -69,8 +111,24 @@ std::string_view sourceHelp() {
            "                 example: --source modem\n"
            "  modem:N        the modem whose object path ends in /Modem/N\n"
            "                 example: --source modem:0\n"
-           "  replay:FILE    a recording made with --record; --speed and --loop apply\n"
+           "  replay:FILE    a recording made with --record; --speed (0 = as fast as the store\n"
+           "                 takes it) and --loop apply\n"
            "                 example: --source replay:drive.pyxrec --speed 10\n";
+}
+
+std::string_view recordingHelp() {
+    return "Recording (--record FILE, --append):\n"
+           "  every event that reaches the client goes, raw and in order, to FILE (an SQLite\n"
+           "  database, .pyxrec), written by a thread of its own and committed at least every\n"
+           "  second. An existing FILE is refused unless --append adds a new session to it.\n"
+           "  When writing fails (disk full, read-only folder, file removed) one line says so\n"
+           "  and the recording stops; everything else goes on. Should the writer fall 65,536\n"
+           "  events behind, later events are dropped and counted until it catches up (said\n"
+           "  once, counted when the recording closes).\n"
+           "  example: --record drive.pyxrec\n"
+           "  example: --source modem --record drive.pyxrec --append\n"
+           "  look at it later: pyxonctl info drive.pyxrec; pyxonctl export drive.pyxrec "
+           "--format csv\n";
 }
 
 }  // namespace pyx::sources

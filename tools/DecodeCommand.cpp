@@ -36,6 +36,30 @@ std::string errorLine(const std::optional<std::int64_t>& metricID, const std::st
 
 }  // namespace
 
+DecodeOutcome decodeRecord(MetricValidator& validator, const MetricRecord& record) {
+    DecodeOutcome outcome;
+    try {
+        // The application's path: the delegate call, "Received Valid Metric" included.
+        validator.metricsDidUpdate(record);
+    } catch (const MetricRejected& rejection) {
+        outcome.metricID = rejection.metricID();
+        outcome.error = rejection.reason();
+        return outcome;
+    }
+    // A record that was not refused is stored exactly when its kind is decoded.
+    outcome.metricID = validator.metricID();
+    const MetricKind* kind = outcome.metricID ? findMetricKind(*outcome.metricID) : nullptr;
+    if (kind == nullptr || !kind->decodable()) {
+        outcome.ignored = true;
+        return outcome;
+    }
+    const auto property = *kind->property;
+    outcome.property = std::string(MetricValidator::nameOf(property));
+    const auto& dict = validator.dictionary(property);
+    if (dict) outcome.dictionary = &*dict;
+    return outcome;
+}
+
 std::string decodeLine(MetricValidator& validator, std::string_view line) {
     MetricRecord record;
     try {
@@ -43,26 +67,16 @@ std::string decodeLine(MetricValidator& validator, std::string_view line) {
     } catch (const RecordError& error) {
         return errorLine(error.metricID(), error.reason());
     }
-    try {
-        // The application's path: the delegate call, "Received Valid Metric" included.
-        validator.metricsDidUpdate(record);
-    } catch (const MetricRejected& rejection) {
-        return errorLine(rejection.metricID(), rejection.reason());
-    }
-
-    // A record that was not refused is stored exactly when its kind is decoded.
-    const auto& id = validator.metricID();
+    const DecodeOutcome outcome = decodeRecord(validator, record);
+    if (outcome.error) return errorLine(outcome.metricID, *outcome.error);
     Json out = Json::object();
-    out["metric"] = metricText(id);
-    const MetricKind* kind = id ? findMetricKind(*id) : nullptr;
-    if (kind == nullptr || !kind->decodable()) {
+    out["metric"] = metricText(outcome.metricID);
+    if (outcome.ignored) {
         out["ignored"] = true;
         return dumped(out);
     }
-    const auto property = *kind->property;
-    out["property"] = std::string(MetricValidator::nameOf(property));
-    const auto& dict = validator.dictionary(property);
-    out["dict"] = dict ? toJson(Value(*dict)) : Json(nullptr);
+    out["property"] = outcome.property;
+    out["dict"] = outcome.dictionary ? toJson(Value(*outcome.dictionary)) : Json(nullptr);
     return dumped(out);
 }
 
@@ -92,9 +106,11 @@ Subcommand addDecodeCommand(CLI::App& pyxonctl) {
         "\"pusch_tx_power\":15}]}}\n"
         "A metric the store does not care for gives {\"metric\":\"0x3CD301\",\"ignored\":true};\n"
         "a refused record or a line that is not a record gives\n"
-        "{\"metric\":\"0x3CD302\" or null,\"error\":\"what was wrong\"}. The store's own log "
-        "lines\n"
-        "go to stderr. The exit code is 0 once all input is read.\n");
+        "{\"metric\":\"0x3CD302\" or null,\"error\":\"what was wrong\"}; a payload that does not\n"
+        "decode says why and at which byte, e.g. for the payload \"08ff\"\n"
+        "  {\"metric\":\"0x3CD302\",\"error\":\"does not decode as "
+        "KCellularLteTxPower: truncated varint at byte 1\"}\n"
+        "The store's own log lines go to stderr. The exit code is 0 once all input is read.\n");
     return Subcommand{decode, [] {
                           standardOutputSink().redirect(stderr);
                           return runDecode(std::cin, std::cout);

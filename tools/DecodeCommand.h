@@ -3,7 +3,9 @@
 // or why it was refused.
 #pragma once
 
+#include <cstdint>
 #include <iosfwd>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -11,6 +13,19 @@
 #include "tools/Subcommand.h"
 
 namespace pyx {
+
+// Where one record landed after the store's intake, as the application path takes it.
+struct DecodeOutcome {
+    std::optional<std::int64_t> metricID;  // as the store read it
+    std::optional<std::string> error;      // the store refused the record: why
+    bool ignored = false;                  // a kind the store does not keep
+    std::string property;                  // the store property that now holds it
+    const Dict* dictionary = nullptr;      // its decoded, converted dictionary (the store's)
+};
+
+// Runs record through validator's intake (metricsDidUpdate) and says where it landed. The
+// dictionary stays valid until the next record goes in.
+[[nodiscard]] DecodeOutcome decodeRecord(MetricValidator& validator, const MetricRecord& record);
 
 // The JSON line for one input line, after running it through validator:
 //   {"metric":"0x3CD302","property":"myLTETxPowerDict","dict":{...}}

@@ -26,6 +26,9 @@ struct ListenOptions {
     std::string source = "sim";
     std::uint64_t seed = 1;
     double speed = 1.0;
+    bool loop = false;
+    std::optional<std::string> record;
+    bool append = false;
     std::optional<double> duration;
     std::optional<std::uint64_t> count;
 };
@@ -79,9 +82,31 @@ int runListen(const ListenOptions& options) {
     const StopOnSignal stopOnSignal(mainQueue);
 
     std::shared_ptr<velk::client::Transport> transport;
+    std::shared_ptr<recordings::RecordingWriter> recording;
     try {
-        transport =
-            sources::makeTransport(sources::SourceOptions{*spec, options.seed, options.speed});
+        // A replay waits while the events it handed out are not yet taken in.
+        sources::SourceOptions sourceOptions;
+        sourceOptions.spec = *spec;
+        sourceOptions.seed = options.seed;
+        sourceOptions.speed = options.speed;
+        sourceOptions.loop = options.loop;
+        sourceOptions.backlog = [] {
+            return MainQueue::shared().pending() + VelkWrapper::queue().pending();
+        };
+        // A replay that ends ends the run, once the events before the end are printed: the
+        // stop goes the way the events go, through the serial queue, then the main queue.
+        sourceOptions.onEnd = [&mainQueue] {
+            VelkWrapper::queue().post(
+                [&mainQueue] { mainQueue.post([&mainQueue] { mainQueue.stop(); }); });
+        };
+        transport = sources::makeTransport(sourceOptions);
+        if (options.record) {
+            auto recorded = sources::recordSource(
+                std::move(transport), sourceOptions,
+                sources::RecordOptions{*options.record, options.append, PYXON_VERSION});
+            transport = std::move(recorded.transport);
+            recording = std::move(recorded.writer);
+        }
     } catch (const sources::SourceSpecError& e) {
         std::cerr << "pyxonctl listen: " << e.what() << "\n";
         return 2;
@@ -107,6 +132,8 @@ int runListen(const ListenOptions& options) {
     }
     mainQueue.run();
     client->setDelegate({});
+    // What is still queued for the recording is written before the process ends.
+    if (recording) recording->close();
     return 0;
 }
 
@@ -125,21 +152,38 @@ Subcommand addListenCommand(CLI::App& pyxonctl) {
         ->capture_default_str();
     listen
         ->add_option("--speed", options->speed,
-                     "Speed factor of the simulated baseband (2 = events twice as often)")
-        ->check(CLI::PositiveNumber)
+                     "Speed factor: the simulated baseband's events come this many times as "
+                     "often (> 0); a replay divides the recorded timing by it (0 = as fast as "
+                     "they are taken)")
+        ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
+    listen->add_flag("--loop", options->loop, "Replay: start again at the end of the recording");
+    CLI::Option* record =
+        listen
+            ->add_option("--record", options->record,
+                         "Keep every event of this run in FILE (.pyxrec), raw and in order")
+            ->type_name("FILE");
+    listen
+        ->add_flag("--append", options->append,
+                   "With --record: add a new session to an existing recording")
+        ->needs(record);
     listen->add_option("--duration", options->duration, "Stop after this many seconds")
         ->type_name("SECONDS")
         ->check(CLI::NonNegativeNumber);
     listen->add_option("--count", options->count, "Stop after this many metric events")
         ->type_name("N")
         ->check(CLI::PositiveNumber);
-    listen->footer(std::string(sources::sourceHelp()) +
-                   "\nWithout --duration or --count it runs until SIGINT or SIGTERM; it exits 0.\n"
-                   "Examples:\n"
-                   "  pyxonctl listen --speed 20 --count 100 > drive.jsonl\n"
-                   "  pyxonctl listen --source modem --duration 10 | pyxonctl screen LTE \"Serving "
-                   "Cell Meas\"\n");
+    listen->footer(
+        std::string(sources::sourceHelp()) + "\n" + std::string(sources::recordingHelp()) +
+        "\nWithout --duration or --count it runs until SIGINT or SIGTERM, or until a replay\n"
+        "without --loop reaches the end of its recording; it exits 0.\n"
+        "Examples:\n"
+        "  pyxonctl listen --speed 20 --count 100 > drive.jsonl\n"
+        "  pyxonctl listen --source modem --duration 10 | pyxonctl screen LTE \"Serving "
+        "Cell Meas\"\n"
+        "  pyxonctl listen --source modem --duration 3600 --record drive.pyxrec > "
+        "/dev/null\n"
+        "  pyxonctl listen --source replay:drive.pyxrec --speed 0 | pyxonctl decode\n");
     return Subcommand{listen, [options] { return runListen(*options); }};
 }
 

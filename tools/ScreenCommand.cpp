@@ -81,7 +81,7 @@ int runScreen(const ScreenRequest& request, std::istream& in, std::ostream& out,
         screen.setSeguedThroughRow(request.category);
         out << screenJson(screen, key) << '\n';
     } else {
-        SecondLevelViewController screen(store);
+        SecondLevelViewController screen(*store);
         screen.setFirstSelection(request.group);
         screen.setSeguedThroughRow(request.category);
         out << screenJson(screen, key) << '\n';

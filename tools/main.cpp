@@ -3,6 +3,8 @@
 #include <vector>
 
 #include "tools/DecodeCommand.h"
+#include "tools/ExportCommand.h"
+#include "tools/InfoCommand.h"
 #include "tools/ListenCommand.h"
 #ifdef PYXON_HAVE_SCREEN_COMMAND
 #include "tools/ScreenCommand.h"
@@ -13,12 +15,15 @@ int main(int argc, char** argv) {  // NOLINT(bugprone-exception-escape)
     CLI::App pyxonctl{
         "pyxonctl: tools around Pyxon's metric store.\n"
         "Example: echo '{\"kKeyMetricID\": 3986178, \"kKeyPayload\": "
-        "\"08fbb0def7d32b12040814101e\"}' | pyxonctl decode",
+        "\"08fbb0def7d32b12040814101e\"}' | pyxonctl decode\n"
+        "Recordings: pyxonctl listen --source modem --record drive.pyxrec > /dev/null;\n"
+        "  pyxonctl info drive.pyxrec; pyxonctl export drive.pyxrec --format csv > drive.csv",
         "pyxonctl"};
     pyxonctl.require_subcommand(1);
     pyxonctl.set_version_flag("--version", std::string("pyxonctl ") + PYXON_VERSION);
-    std::vector<pyx::Subcommand> subcommands{pyx::addDecodeCommand(pyxonctl),
-                                             pyx::addListenCommand(pyxonctl)};
+    std::vector<pyx::Subcommand> subcommands{
+        pyx::addDecodeCommand(pyxonctl), pyx::addListenCommand(pyxonctl),
+        pyx::addInfoCommand(pyxonctl), pyx::addExportCommand(pyxonctl)};
 #ifdef PYXON_HAVE_SCREEN_COMMAND
     subcommands.push_back(pyx::addScreenCommand(pyxonctl));
 #endif

@@ -1,5 +1,6 @@
 #include "ui/FirstLevelViewController.h"
 
+#include <memory>
 #include <utility>
 
 #include "ui/ScreenSelectionError.h"
@@ -7,10 +8,7 @@
 
 namespace pyx {
 
-FirstLevelViewController::FirstLevelViewController(std::shared_ptr<MetricValidator> validator)
-    : myMetricValidator_(std::move(validator)) {}
-
-const std::vector<std::string>& FirstLevelViewController::categories() const {
+const std::vector<std::string>& FirstLevelViewController::titles() const {
     if (!seguedThroughRow_)
         throw ScreenSelectionError("FirstLevelViewController", "seguedThroughRow", std::nullopt);
     const auto found = tableViewFields_.firstLevelViewItems.find(*seguedThroughRow_);
@@ -18,14 +16,6 @@ const std::vector<std::string>& FirstLevelViewController::categories() const {
         throw ScreenSelectionError("FirstLevelViewController", "seguedThroughRow",
                                    seguedThroughRow_);
     return found->second;
-}
-
-int FirstLevelViewController::numberOfRowsInSection(int) const {
-    return static_cast<int>(categories().size());
-}
-
-Cell FirstLevelViewController::cellForRowAtIndexPath(int, int row) const {
-    return menuCell(categories(), row);
 }
 
 void FirstLevelViewController::prepareForSegue(TableController& destination,
@@ -41,6 +31,13 @@ void FirstLevelViewController::prepareSecondLevel(SecondLevelViewController& des
                                                   int row) const {
     const Cell tapped = cellForRowAtIndexPath(0, row);
     prepareForSegue(destination, &tapped);
+}
+
+std::optional<Destination> FirstLevelViewController::open(const Cell& tapped) const {
+    auto category = std::make_shared<SecondLevelViewController>(*myMetricValidator_);
+    prepareForSegue(*category, &tapped);
+    std::string title = category->seguedThroughRow().value_or(std::string());
+    return Destination{std::move(category), std::move(title)};
 }
 
 }  // namespace pyx

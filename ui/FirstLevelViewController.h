@@ -2,24 +2,22 @@
 // category opens the second-level screen with the pair (group, category).
 #pragma once
 
-#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "metrics/MetricValidator.h"
+#include "ui/MenuController.h"
 #include "ui/PyxViewItems.h"
-#include "ui/TableController.h"
 
 namespace pyx {
 
 class SecondLevelViewController;
 
-class FirstLevelViewController : public TableController {
+class FirstLevelViewController : public MenuController {
   public:
-    // validator: kept for the screens that follow; this menu does not read it.
-    explicit FirstLevelViewController(
-        std::shared_ptr<MetricValidator> validator = MetricValidator::sharedInstance());
+    // store: handed on to the screens that follow; this menu does not read it.
+    explicit FirstLevelViewController(MetricValidator& store) : myMetricValidator_(&store) {}
 
     // The group chosen on the launch screen (the row this menu was reached through).
     [[nodiscard]] const std::optional<std::string>& seguedThroughRow() const {
@@ -29,18 +27,10 @@ class FirstLevelViewController : public TableController {
         seguedThroughRow_ = std::move(group);
     }
     [[nodiscard]] const PyxViewItems& tableViewFields() const { return tableViewFields_; }
-    [[nodiscard]] const std::shared_ptr<MetricValidator>& myMetricValidator() const {
-        return myMetricValidator_;
-    }
+    [[nodiscard]] MetricValidator& myMetricValidator() const { return *myMetricValidator_; }
 
-    [[nodiscard]] int numberOfSections() const override { return 1; }
-    [[nodiscard]] std::optional<std::string> titleForHeaderInSection(int) const override {
-        return std::nullopt;
-    }
-    // Both throw ScreenSelectionError when the group is not set or not one of the four;
-    // the cell throws std::out_of_range past the group's last category.
-    [[nodiscard]] int numberOfRowsInSection(int section) const override;
-    [[nodiscard]] Cell cellForRowAtIndexPath(int section, int row) const override;
+    // The rows and cells throw ScreenSelectionError when the group is not set or not one of
+    // the four; a cell past the group's last category is left as dequeued.
 
     // A transition to destination, started by tapping sender (nullptr when it was not started
     // from a cell). Only a second-level screen reached from a cell receives this menu's group
@@ -49,12 +39,16 @@ class FirstLevelViewController : public TableController {
     // The tap on row: hands destination the group and that row's category.
     void prepareSecondLevel(SecondLevelViewController& destination, int row) const;
 
-  private:
-    [[nodiscard]] const std::vector<std::string>& categories() const;
+    // The category screen of the pair (group, tapped category), titled by the category.
+    [[nodiscard]] std::optional<Destination> open(const Cell& tapped) const override;
 
+  protected:
+    [[nodiscard]] const std::vector<std::string>& titles() const override;
+
+  private:
     std::optional<std::string> seguedThroughRow_;
     const PyxViewItems tableViewFields_ = makePyxViewItems();
-    std::shared_ptr<MetricValidator> myMetricValidator_;
+    MetricValidator* myMetricValidator_;
 };
 
 }  // namespace pyx

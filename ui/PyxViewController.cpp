@@ -1,16 +1,14 @@
 #include "ui/PyxViewController.h"
 
+#include <memory>
+
 #include "ui/FirstLevelViewController.h"
 #include "ui/PyxViewItems.h"
 
 namespace pyx {
 
-int PyxViewController::numberOfRowsInSection(int) const {
-    return static_cast<int>(sharedPyxViewItems().launchViewItemNames.size());
-}
-
-Cell PyxViewController::cellForRowAtIndexPath(int, int row) const {
-    return menuCell(sharedPyxViewItems().launchViewItemNames, row);
+const std::vector<std::string>& PyxViewController::titles() const {
+    return sharedPyxViewItems().launchViewItemNames;
 }
 
 void PyxViewController::prepareForSegue(TableController& destination, const Cell* sender) const {
@@ -23,6 +21,13 @@ void PyxViewController::prepareForSegue(TableController& destination, const Cell
 void PyxViewController::prepareFirstLevel(FirstLevelViewController& destination, int row) const {
     const Cell tapped = cellForRowAtIndexPath(0, row);
     prepareForSegue(destination, &tapped);
+}
+
+std::optional<Destination> PyxViewController::open(const Cell& tapped) const {
+    auto menu = std::make_shared<FirstLevelViewController>(*store_);
+    prepareForSegue(*menu, &tapped);
+    std::string title = menu->seguedThroughRow().value_or(std::string());
+    return Destination{std::move(menu), std::move(title)};
 }
 
 }  // namespace pyx

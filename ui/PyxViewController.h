@@ -2,21 +2,21 @@
 // first-level menu for it.
 #pragma once
 
-#include "ui/TableController.h"
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "metrics/MetricValidator.h"
+#include "ui/MenuController.h"
 
 namespace pyx {
 
 class FirstLevelViewController;
 
-class PyxViewController : public TableController {
+class PyxViewController : public MenuController {
   public:
-    [[nodiscard]] int numberOfSections() const override { return 1; }
-    [[nodiscard]] std::optional<std::string> titleForHeaderInSection(int) const override {
-        return std::nullopt;
-    }
-    [[nodiscard]] int numberOfRowsInSection(int section) const override;
-    // The group title at row; throws std::out_of_range past the last group.
-    [[nodiscard]] Cell cellForRowAtIndexPath(int section, int row) const override;
+    // store: handed on to the screens that follow; this list does not read it.
+    explicit PyxViewController(MetricValidator& store) : store_(&store) {}
 
     // A transition to destination, started by tapping sender (nullptr when it was not started
     // from a cell). Only a first-level menu reached from a cell receives the cell's text as
@@ -24,6 +24,15 @@ class PyxViewController : public TableController {
     void prepareForSegue(TableController& destination, const Cell* sender) const;
     // The tap on row: hands destination that row's group.
     void prepareFirstLevel(FirstLevelViewController& destination, int row) const;
+
+    // The first-level menu of the tapped group, titled by the group.
+    [[nodiscard]] std::optional<Destination> open(const Cell& tapped) const override;
+
+  protected:
+    [[nodiscard]] const std::vector<std::string>& titles() const override;
+
+  private:
+    MetricValidator* store_;
 };
 
 }  // namespace pyx

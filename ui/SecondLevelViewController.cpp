@@ -2,12 +2,14 @@
 
 #include <array>
 #include <cstddef>
+#include <memory>
 #include <string_view>
 #include <utility>
 #include <variant>
 
 #include "core/Log.h"
 #include "ui/ScreenSelectionError.h"
+#include "ui/ThirdLevelViewController.h"
 
 namespace pyx {
 namespace {
@@ -184,9 +186,6 @@ Cell entryCell(const DisplayDictionary& dictionary, int row) {
 
 }  // namespace
 
-SecondLevelViewController::SecondLevelViewController(std::shared_ptr<MetricValidator> validator)
-    : myMetricValidator_(std::move(validator)) {}
-
 std::string SecondLevelViewController::categoryKey() const {
     if (!firstSelection_)
         throw ScreenSelectionError("SecondLevelViewController", "firstSelection", std::nullopt);
@@ -244,5 +243,18 @@ Cell SecondLevelViewController::cellForRowAtIndexPath(int section, int row) cons
 }
 
 void SecondLevelViewController::prepareForSegue(TableController&, const Cell*) const {}
+
+std::optional<std::string> SecondLevelViewController::shownCategory() const {
+    if (!firstSelection_ || !seguedThroughRow_) return std::nullopt;
+    return categoryKey();
+}
+
+std::optional<Destination> SecondLevelViewController::open(const Cell& tapped) const {
+    auto details = std::make_shared<ThirdLevelViewController>();
+    prepareForSegue(*details, &tapped);
+    std::string title = tapped.text.value_or(std::string());
+    if (title.empty()) title = seguedThroughRow_.value_or(std::string());
+    return Destination{std::move(details), std::move(title)};
+}
 
 }  // namespace pyx

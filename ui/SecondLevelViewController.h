@@ -3,7 +3,6 @@
 // key that selects what the screen reads; every query reads the store afresh.
 #pragma once
 
-#include <memory>
 #include <optional>
 #include <string>
 
@@ -15,9 +14,8 @@ namespace pyx {
 
 class SecondLevelViewController : public TableController {
   public:
-    // validator: the store the screen reads.
-    explicit SecondLevelViewController(
-        std::shared_ptr<MetricValidator> validator = MetricValidator::sharedInstance());
+    // store: the store the screen reads.
+    explicit SecondLevelViewController(MetricValidator& store) : myMetricValidator_(&store) {}
 
     // The group ("LTE"), first half of the key.
     [[nodiscard]] const std::optional<std::string>& firstSelection() const {
@@ -34,9 +32,7 @@ class SecondLevelViewController : public TableController {
     // The cell last shown; the table queries do not use it.
     [[nodiscard]] const std::optional<Cell>& currentCell() const { return currentCell_; }
     void setCurrentCell(std::optional<Cell> cell) { currentCell_ = std::move(cell); }
-    [[nodiscard]] const std::shared_ptr<MetricValidator>& myMetricValidator() const {
-        return myMetricValidator_;
-    }
+    [[nodiscard]] MetricValidator& myMetricValidator() const { return *myMetricValidator_; }
     [[nodiscard]] const PyxViewItems& tableViewFields() const { return tableViewFields_; }
 
     // firstSelection, a blank, seguedThroughRow ("LTE C-DRX"); throws ScreenSelectionError
@@ -58,12 +54,19 @@ class SecondLevelViewController : public TableController {
     // The transition to the third-level screen carries nothing from this screen.
     void prepareForSegue(TableController& destination, const Cell* sender) const;
 
+    // The third-level placeholder, titled by the tapped entry's key (by the category when the
+    // row has no text); it receives nothing else.
+    [[nodiscard]] std::optional<Destination> open(const Cell& tapped) const override;
+    [[nodiscard]] bool followsStore() const override { return true; }
+    // categoryKey, or nothing while a selection is not set.
+    [[nodiscard]] std::optional<std::string> shownCategory() const override;
+
   private:
     const PyxViewItems tableViewFields_ = makePyxViewItems();
     std::optional<std::string> firstSelection_;
     std::optional<std::string> seguedThroughRow_;
     std::optional<Cell> currentCell_;
-    std::shared_ptr<MetricValidator> myMetricValidator_;
+    MetricValidator* myMetricValidator_;
 };
 
 }  // namespace pyx

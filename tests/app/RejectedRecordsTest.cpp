@@ -35,3 +35,23 @@ TEST(RejectedRecords, OtherErrorsStillEndTheRun) {
     EXPECT_THROW(queue.drain(), std::logic_error);
     EXPECT_EQ(rejected.count(), 0U);
 }
+
+TEST(RejectedRecords, UndecodablePayloadLineSaysWhyAndAtWhichByte) {
+    pyx::MainQueue queue;
+    pyx::CapturedLines log(pyx::systemLogSink());
+    pyx::CapturedLines out(pyx::standardOutputSink());
+    const auto validator = pyx::MetricValidator::create(nullptr);
+    // An LTE RRC state whose prev_state_dur_ms value is cut at byte 12.
+    pyx::MetricRecord record;
+    record.append("kKeyMetricID", pyx::Value(std::int64_t{0x3C4E04}));
+    record.append("kKeyPayload", pyx::Value(pyx::Bytes{0x08, 0xFB, 0xB0, 0xDE, 0xF7, 0xD3, 0x2B,
+                                                       0x10, 0x03, 0x18, 0x01, 0x20, 0x85}));
+    {
+        const pyx::RejectedRecords rejected(queue);
+        queue.post([&] { validator->metricsDidUpdate(record); });
+        queue.drain();
+    }
+    EXPECT_TRUE(
+        log.contains("pyxon: rejected metric record 0x3C4E04: does not decode as "
+                     "KCellularLteRrcState: truncated varint at byte 12"));
+}

@@ -85,7 +85,7 @@ TEST_F(DebianPackage, NamesItsDependenciesAndRecommendsModemManager) {
     for (const char* module :
          {"qml6-module-qtquick", "qml6-module-qtquick-controls", "qml6-module-qtquick-layouts",
           "qml6-module-qtquick-window", "qml6-module-qtquick-templates",
-          "qml6-module-qtqml-workerscript", "qt6-qpa-plugins"})
+          "qml6-module-qtqml-workerscript", "qml6-module-qtcharts", "qt6-qpa-plugins"})
         EXPECT_NE(depends.find(std::string(", ") + module + ","), std::string::npos)
             << module << " missing from: " << depends;
 }

@@ -209,8 +209,73 @@ TEST_F(Intake, RejectionNamesTheMetricIDAndReason) {
     } catch (const MetricRejected& rejection) {
         EXPECT_EQ(rejection.metricID(), std::int64_t{3986178});
         EXPECT_EQ(std::string(rejection.what()),
-                  "metric 0x3CD302: the payload does not decode as KCellularLteTxPower");
+                  "metric 0x3CD302: does not decode as KCellularLteTxPower: "
+                  "truncated varint at byte 1");
     }
+}
+
+// A payload that does not decode is refused with the reason and the byte where it stands.
+// KCellularLteRrcState (0x3C4E04): timestamp (7 bytes), state, prev_state, then the key of
+// prev_state_dur_ms at byte 11 and its value cut at byte 12.
+const Bytes kRrcStateCutAtByte12 = {0x08, 0xFB, 0xB0, 0xDE, 0xF7, 0xD3, 0x2B,
+                                    0x10, 0x03, 0x18, 0x01, 0x20, 0x85};
+
+TEST_F(Intake, TruncatedVarintIsRejectedWithItsByte) {
+    expectRejectedWithoutChange(
+        metricRecord(3952132, kRrcStateCutAtByte12),
+        "does not decode as KCellularLteRrcState: truncated varint at byte 12");
+}
+
+TEST_F(Intake, RejectionLineOfAnUndecodablePayloadSaysWhyAndWhere) {
+    try {
+        validator->metricsDidUpdate(metricRecord(3952132, kRrcStateCutAtByte12));
+        FAIL() << "the record was taken";
+    } catch (const MetricRejected& rejection) {
+        EXPECT_EQ(std::string(rejection.what()),
+                  "metric 0x3C4E04: does not decode as KCellularLteRrcState: "
+                  "truncated varint at byte 12");
+    }
+}
+
+TEST_F(Intake, NestedRecordPastTheEndIsRejectedWithItsByte) {
+    // A list record: the last neighbour's length runs past the end of the payload.
+    Bytes truncated = testing::lteNbrEutraMeas(10, 10);
+    truncated.pop_back();
+    expectRejectedWithoutChange(metricRecord(3986191, truncated), "length past the end at byte ");
+}
+
+TEST_F(Intake, LengthPastTheEndIsRejectedWithItsByte) {
+    // tx_power_info of 5 bytes with 2 present.
+    expectRejectedWithoutChange(
+        metricRecord(3986178, Bytes{0x08, 0x01, 0x12, 0x05, 0x08, 0x0A}),
+        "does not decode as KCellularLteTxPower: length past the end at byte 3");
+}
+
+TEST_F(Intake, TruncatedFixedWidthValueIsRejectedWithItsByte) {
+    // Unknown field 20 as fixed64 with three bytes.
+    expectRejectedWithoutChange(
+        metricRecord(3986178, Bytes{0x08, 0x01, 0xA1, 0x01, 0x01, 0x02, 0x03}),
+        "does not decode as KCellularLteTxPower: truncated fixed-width value at "
+        "byte 4");
+}
+
+TEST_F(Intake, UnknownWireTypeIsRejectedWithItsByte) {
+    expectRejectedWithoutChange(
+        metricRecord(3986178, Bytes{0x08, 0x01, 0x4F}),
+        "does not decode as KCellularLteTxPower: unknown wire type at byte 2");
+}
+
+TEST_F(Intake, MismatchedEndOfGroupIsRejectedWithItsByte) {
+    // Group 23 closed by field 24's end key.
+    expectRejectedWithoutChange(metricRecord(3986178, Bytes{0x08, 0x01, 0xBB, 0x01, 0xC4, 0x01}),
+                                "does not decode as KCellularLteTxPower: end of group "
+                                "does not match its start at byte 4");
+}
+
+TEST_F(Intake, GroupWithoutItsEndIsRejectedWithItsByte) {
+    expectRejectedWithoutChange(
+        metricRecord(3986178, Bytes{0x08, 0x01, 0xBB, 0x01, 0x08, 0x02}),
+        "does not decode as KCellularLteTxPower: group without its end at byte 2");
 }
 
 TEST_F(Intake, MetricIDIsTheLastProcessedEvenWhenRejected) {

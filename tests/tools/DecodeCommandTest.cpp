@@ -48,7 +48,50 @@ TEST_F(Decode, NotCaredForMetricIsIgnored) {
 TEST_F(Decode, RejectedRecordGivesTheMetricAndTheReason) {
     EXPECT_EQ(decoded(R"({"kKeyMetricID": 3986178, "kKeyPayload": "08ff"})"),
               Json::parse(R"({"metric":"0x3CD302",
-                              "error":"the payload does not decode as KCellularLteTxPower"})"));
+                              "error":"does not decode as KCellularLteTxPower: truncated varint at byte 1"})"));
+}
+
+// The "error" of a payload that does not decode: the class, the reason and the byte.
+class DecodeRefusal : public Decode {
+  protected:
+    std::string errorOf(std::int64_t metricID, const std::string& hexPayload) {
+        const Json out = decoded(R"({"kKeyMetricID": )" + std::to_string(metricID) +
+                                 R"(, "kKeyPayload": ")" + hexPayload + R"("})");
+        EXPECT_FALSE(out.contains("dict")) << out.dump();
+        return out.value("error", "");
+    }
+};
+
+TEST_F(DecodeRefusal, TruncatedVarint) {
+    EXPECT_EQ(errorOf(3952132, "08fbb0def7d32b100318012085"),
+              "does not decode as KCellularLteRrcState: truncated varint at byte 12");
+}
+
+TEST_F(DecodeRefusal, LengthPastTheEnd) {
+    EXPECT_EQ(errorOf(3986178, "08011205080a"),
+              "does not decode as KCellularLteTxPower: length past the end at byte 3");
+}
+
+TEST_F(DecodeRefusal, TruncatedFixedWidthValue) {
+    EXPECT_EQ(errorOf(3986178, "0801a101010203"),
+              "does not decode as KCellularLteTxPower: truncated fixed-width value at "
+              "byte 4");
+}
+
+TEST_F(DecodeRefusal, UnknownWireType) {
+    EXPECT_EQ(errorOf(3986178, "08014f"),
+              "does not decode as KCellularLteTxPower: unknown wire type at byte 2");
+}
+
+TEST_F(DecodeRefusal, MismatchedEndOfGroup) {
+    EXPECT_EQ(errorOf(3986178, "0801bb01c401"),
+              "does not decode as KCellularLteTxPower: end of group does not match "
+              "its start at byte 4");
+}
+
+TEST_F(DecodeRefusal, GroupWithoutItsEnd) {
+    EXPECT_EQ(errorOf(3986178, "0801bb010802"),
+              "does not decode as KCellularLteTxPower: group without its end at byte 2");
 }
 
 TEST_F(Decode, LineThatIsNotARecordGivesNullMetric) {

@@ -76,7 +76,7 @@ TEST(Pyxonctl, DecodeWritesOneJsonLinePerRecordAndTheStoreLinesToStderr) {
                 "tx_power_info":[{"pucch_tx_power":10,"pusch_tx_power":15}]}})"));
     EXPECT_EQ(lines[1], Json::parse(R"({"metric":"0x3CD301","ignored":true})"));
     EXPECT_EQ(lines[2], Json::parse(R"({"metric":"0x3CD302",
-        "error":"the payload does not decode as KCellularLteTxPower"})"));
+        "error":"does not decode as KCellularLteTxPower: truncated varint at byte 1"})"));
     EXPECT_TRUE(lines[3]["metric"].is_null());
     EXPECT_EQ(lines[3]["error"], "the line is not a JSON object");
     EXPECT_EQ(lines[4], Json::parse(R"({"metric":"0x3C40C2","property":"myLTESCellInfoDict",

@@ -131,7 +131,7 @@ class MenuPairs : public ::testing::TestWithParam<std::size_t> {
 
     const Pair& pair() const { return menuPairs()[GetParam()]; }
     SecondLevelViewController screen() const {
-        SecondLevelViewController out(store);
+        SecondLevelViewController out(*store);
         out.setFirstSelection(pair().group);
         out.setSeguedThroughRow(pair().category);
         return out;

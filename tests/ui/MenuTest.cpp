@@ -25,10 +25,10 @@ std::vector<std::string> texts(const TableController& screen) {
 class Menu : public ::testing::Test {
   protected:
     std::shared_ptr<MetricValidator> store = test::emptyStore();
-    PyxViewController launch;
+    PyxViewController launch{*store};
 
     FirstLevelViewController menuFor(const std::string& group) {
-        FirstLevelViewController menu(store);
+        FirstLevelViewController menu(*store);
         menu.setSeguedThroughRow(group);
         return menu;
     }
@@ -73,11 +73,11 @@ TEST_F(Menu, CategoriesAreListedInDisplayOrder) {
 }
 
 TEST_F(Menu, ChoosingUmtsThenTxPowerHandsTheSecondLevelThePair) {
-    FirstLevelViewController menu(store);
+    FirstLevelViewController menu(*store);
     launch.prepareFirstLevel(menu, 2);
     EXPECT_EQ(menu.seguedThroughRow(), "UMTS");
 
-    SecondLevelViewController screen(store);
+    SecondLevelViewController screen(*store);
     menu.prepareSecondLevel(screen, 6);
     EXPECT_EQ(screen.firstSelection(), "UMTS");
     EXPECT_EQ(screen.seguedThroughRow(), "Tx Power");
@@ -88,7 +88,7 @@ TEST_F(Menu, SegueToAnyOtherKindOfDestinationPassesNothing) {
     const Cell tapped{"LTE", std::nullopt};
 
     // The launch screen hands its group only to a first-level menu.
-    SecondLevelViewController notAMenu(store);
+    SecondLevelViewController notAMenu(*store);
     launch.prepareForSegue(notAMenu, &tapped);
     EXPECT_EQ(notAMenu.firstSelection(), std::nullopt);
     EXPECT_EQ(notAMenu.seguedThroughRow(), std::nullopt);
@@ -98,7 +98,7 @@ TEST_F(Menu, SegueToAnyOtherKindOfDestinationPassesNothing) {
 
     // The first-level menu hands its pair only to a second-level screen.
     FirstLevelViewController menu = menuFor("GSM");
-    FirstLevelViewController otherMenu(store);
+    FirstLevelViewController otherMenu(*store);
     menu.prepareForSegue(otherMenu, &tapped);
     EXPECT_EQ(otherMenu.seguedThroughRow(), std::nullopt);
     menu.prepareForSegue(details, &tapped);
@@ -107,18 +107,18 @@ TEST_F(Menu, SegueToAnyOtherKindOfDestinationPassesNothing) {
 }
 
 TEST_F(Menu, SegueNotStartedFromACellPassesNothing) {
-    FirstLevelViewController menu(store);
+    FirstLevelViewController menu(*store);
     launch.prepareForSegue(menu, nullptr);
     EXPECT_EQ(menu.seguedThroughRow(), std::nullopt);
 
-    SecondLevelViewController screen(store);
+    SecondLevelViewController screen(*store);
     menuFor("LTE").prepareForSegue(screen, nullptr);
     EXPECT_EQ(screen.firstSelection(), std::nullopt);
     EXPECT_EQ(screen.seguedThroughRow(), std::nullopt);
 }
 
 TEST_F(Menu, CellWithoutTextHandsNoCategory) {
-    SecondLevelViewController screen(store);
+    SecondLevelViewController screen(*store);
     const Cell blank{};
     menuFor("LTE").prepareForSegue(screen, &blank);
     EXPECT_EQ(screen.firstSelection(), "LTE");
@@ -126,7 +126,7 @@ TEST_F(Menu, CellWithoutTextHandsNoCategory) {
 }
 
 TEST_F(Menu, FirstLevelWithoutGroupRefusesToAnswer) {
-    const FirstLevelViewController menu(store);
+    const FirstLevelViewController menu(*store);
     try {
         (void)menu.numberOfRowsInSection(0);
         FAIL() << "no error";
@@ -161,8 +161,8 @@ TEST_F(Menu, RowPastTheListIsACellLeftAsDequeued) {
 TEST_F(Menu, EveryScreenKeepsItsOwnCopyOfTheMenuItems) {
     const PyxViewItems& shared = sharedPyxViewItems();
     EXPECT_EQ(&shared, &sharedPyxViewItems());
-    const FirstLevelViewController menu(store);
-    const SecondLevelViewController screen(store);
+    const FirstLevelViewController menu(*store);
+    const SecondLevelViewController screen(*store);
     const ThirdLevelViewController details;
     for (const PyxViewItems* copy :
          {&menu.tableViewFields(), &screen.tableViewFields(), &details.tableViewFields()}) {
@@ -173,9 +173,32 @@ TEST_F(Menu, EveryScreenKeepsItsOwnCopyOfTheMenuItems) {
     EXPECT_EQ(shared.firstLevelViewItems.size(), 4U);
 }
 
+TEST_F(Menu, EachScreenSaysWhatATappedRowOpens) {
+    const auto menu = launch.open(Cell{"GSM", std::nullopt});
+    ASSERT_TRUE(menu);
+    EXPECT_EQ(menu->title, "GSM");
+    EXPECT_EQ(texts(*menu->controller).size(), 11U);
+    EXPECT_TRUE(launch.leadsFurther());
+    EXPECT_TRUE(menu->controller->leadsFurther());
+
+    const auto screen = menu->controller->open(Cell{"NAS MM", std::nullopt});
+    ASSERT_TRUE(screen);
+    EXPECT_EQ(screen->title, "NAS MM");
+    EXPECT_TRUE(screen->controller->followsStore());
+    EXPECT_FALSE(screen->controller->leadsFurther());
+    EXPECT_EQ(screen->controller->cellForRowAtIndexPath(0, 0), Cell{});
+
+    const auto details = screen->controller->open(Cell{"mm_state", "3"});
+    ASSERT_TRUE(details);
+    EXPECT_EQ(details->title, "mm_state");
+    EXPECT_EQ(screen->controller->open(Cell{})->title, "NAS MM");
+    EXPECT_FALSE(details->controller->followsStore());
+    EXPECT_FALSE(details->controller->open(Cell{"x", "y"}).has_value());
+}
+
 TEST_F(Menu, FirstLevelKeepsTheStoreItWasGiven) {
-    const FirstLevelViewController menu(store);
-    EXPECT_EQ(menu.myMetricValidator(), store);
+    const FirstLevelViewController menu(*store);
+    EXPECT_EQ(&menu.myMetricValidator(), store.get());
     EXPECT_EQ(menu.seguedThroughRow(), std::nullopt);
 }
 

@@ -21,7 +21,7 @@ class SecondLevel : public ::testing::Test {
     std::shared_ptr<MetricValidator> store = test::emptyStore();
 
     SecondLevelViewController screen(std::string group, std::string category) {
-        SecondLevelViewController out(store);
+        SecondLevelViewController out(*store);
         out.setFirstSelection(std::move(group));
         out.setSeguedThroughRow(std::move(category));
         return out;
@@ -99,7 +99,7 @@ TEST_F(SecondLevel, UmtsServingCellMeasShowsTitledSectionsThatComeBackLater) {
 
 TEST_F(SecondLevel, UmtsServingCellMeasurementShowsTheFirstEntryOfTheFirstElement) {
     test::feedUmtsScellMeas(*store, 2);
-    SecondLevelViewController s(store);
+    SecondLevelViewController s(*store);
     s.setFirstSelection("UMTS");
     s.setSeguedThroughRow("Serving Cell Measurement");
     EXPECT_EQ(s.numberOfSections(), 1);
@@ -309,7 +309,7 @@ TEST_F(SecondLevel, SectionTitlesCountFromZeroWithoutPadding) {
 }
 
 TEST_F(SecondLevel, MissingSelectionsRefuseToAnswer) {
-    SecondLevelViewController s(store);
+    SecondLevelViewController s(*store);
     EXPECT_THROW((void)s.numberOfSections(), ScreenSelectionError);
     s.setFirstSelection("LTE");
     try {
@@ -330,11 +330,11 @@ TEST_F(SecondLevel, MissingSelectionsRefuseToAnswer) {
 }
 
 TEST_F(SecondLevel, StartsWithNothingSelectedAndTheStoreItWasGiven) {
-    const SecondLevelViewController s(store);
+    const SecondLevelViewController s(*store);
     EXPECT_EQ(s.firstSelection(), std::nullopt);
     EXPECT_EQ(s.seguedThroughRow(), std::nullopt);
     EXPECT_EQ(s.currentCell(), std::nullopt);
-    EXPECT_EQ(s.myMetricValidator(), store);
+    EXPECT_EQ(&s.myMetricValidator(), store.get());
 }
 
 TEST_F(SecondLevel, CurrentCellIsNotReadByTheTable) {

@@ -66,11 +66,37 @@ FocusScope {
             }
         }
 
+        Item {
+            id: chartButton
+            objectName: "chartButton"
+            anchors { right: parent.right; top: parent.top; bottom: parent.bottom }
+            width: chartLabel.implicitWidth + 24
+            visible: root.screen !== null && root.screen.charted
+            Accessible.role: Accessible.Button
+            Accessible.name: "Chart"
+
+            Text {
+                id: chartLabel
+                anchors { right: parent.right; rightMargin: 12; verticalCenter: parent.verticalCenter }
+                text: "Chart"
+                font.pixelSize: 17
+                color: chartArea.pressed ? Qt.darker(sys.highlight, 1.3) : sys.highlight
+            }
+            MouseArea {
+                id: chartArea
+                anchors.fill: parent
+                onClicked: {
+                    root.keyboardActive = false
+                    root.navigator.openChart()
+                }
+            }
+        }
+
         Text {
             id: titleLabel
             objectName: "titleLabel"
             anchors.centerIn: parent
-            width: bar.width - 2 * Math.max(backButton.width, 16) - 8
+            width: bar.width - 2 * Math.max(backButton.width, chartButton.visible ? chartButton.width : 16, 16) - 8
             horizontalAlignment: Text.AlignHCenter
             text: root.title
             elide: Text.ElideRight
@@ -105,11 +131,15 @@ FocusScope {
         id: pageComponent
         ScreenPage {}
     }
+    Component {
+        id: chartComponent
+        ChartPage {}
+    }
 
     Connections {
         target: root.navigator
         function onPushed(screen) {
-            stack.push(pageComponent, { screen: screen, navigator: root.navigator, colors: sys, view: root },
+            stack.push(screen.chart ? chartComponent : pageComponent, { screen: screen, navigator: root.navigator, colors: sys, view: root },
                        root.navigator.animated ? StackView.PushTransition : StackView.Immediate)
         }
         function onPopped() {

@@ -63,7 +63,7 @@ FocusScope {
         delegate: TableItem {
             width: ListView.view.width
             colors: page.colors
-            chevron: page.screen !== null && page.screen.level < 2
+            chevron: page.screen !== null && page.screen.leadsFurther
             current: ListView.isCurrentItem && list.activeFocus && page.view !== null
                      && page.view.keyboardActive
             onTapped: {

@@ -6,22 +6,27 @@
 #include <utility>
 
 #include "core/MainQueue.h"
-#include "ui/FirstLevelViewController.h"
+#include "metrics/history/History.h"
+#include "ui/ChartScreens.h"
 #include "ui/PyxViewController.h"
-#include "ui/SecondLevelViewController.h"
-#include "ui/ThirdLevelViewController.h"
 
 namespace pyx::qt {
 
-Screen::Screen(Level level, QString title, std::shared_ptr<TableController> controller,
-               QObject* parent)
+Screen::Screen(QString title, std::shared_ptr<TableController> controller,
+               std::optional<Chart> charted, QObject* parent)
     : QObject(parent),
-      level_(level),
       title_(std::move(title)),
       controller_(std::move(controller)),
-      model_(new TableModel(controller_, this)) {}
+      model_(new TableModel(controller_, this)),
+      charted_(charted) {}
+
+Screen::Screen(QString title, ChartModel* chart, QObject* parent)
+    : QObject(parent), title_(std::move(title)), chart_(chart) {
+    chart_->setParent(this);
+}
 
 void Screen::update() {
+    if (model_ == nullptr) return;
     MainQueue::shared().post([model = QPointer<TableModel>(model_)] {
         if (model) model->reload();
     });
@@ -29,11 +34,16 @@ void Screen::update() {
 
 Navigator::Navigator(std::shared_ptr<MetricValidator> validator, QObject* parent)
     : QObject(parent), validator_(std::move(validator)) {
-    stack_.push_back(new Screen(Screen::Launch, QStringLiteral("Pyxon"),
-                                std::make_shared<PyxViewController>(), this));
+    stack_.push_back(new Screen(QStringLiteral("Pyxon"),
+                                std::make_shared<PyxViewController>(*validator_), std::nullopt,
+                                this));
 }
 
-Navigator::~Navigator() = default;
+Navigator::~Navigator() {
+    // The screens' controllers refer to the store: they go before it does.
+    qDeleteAll(retired_);
+    qDeleteAll(stack_);
+}
 
 Screen* Navigator::screenAt(int level) const {
     if (level < 0 || level >= depth()) return nullptr;
@@ -53,45 +63,28 @@ void Navigator::setAnimated(bool animated) {
 }
 
 bool Navigator::select(int index) {
-    Screen* const top = current();
-    const auto path = top->model()->indexPath(index);
-    if (!path) return false;
-    const int row = path->second;
-    const auto fromText = [](const std::optional<std::string>& text) {
-        return text ? QString::fromStdString(*text) : QString();
-    };
-    switch (top->level()) {
-        case Screen::Launch: {
-            auto menu = std::make_shared<FirstLevelViewController>(validator_);
-            static_cast<PyxViewController&>(top->controller()).prepareFirstLevel(*menu, row);
-            const QString title = fromText(menu->seguedThroughRow());
-            push(new Screen(Screen::FirstLevel, title, std::move(menu), this));
-            return true;
-        }
-        case Screen::FirstLevel: {
-            auto category = std::make_shared<SecondLevelViewController>(validator_);
-            static_cast<FirstLevelViewController&>(top->controller())
-                .prepareSecondLevel(*category, row);
-            const QString title = fromText(category->seguedThroughRow());
-            push(new Screen(Screen::SecondLevel, title, std::move(category), this));
-            return true;
-        }
-        case Screen::SecondLevel: {
-            const auto& from = static_cast<SecondLevelViewController&>(top->controller());
-            const std::optional<Cell> tapped = top->model()->cellAt(index);
-            if (!tapped) return false;
-            auto details = std::make_shared<ThirdLevelViewController>();
-            // The category screen hands nothing on: the placeholder's selections stay unset.
-            // Only the title bar names the entry that was tapped.
-            from.prepareForSegue(*details, &*tapped);
-            QString title = fromText(tapped->text);
-            if (title.isEmpty()) title = top->title();
-            push(new Screen(Screen::ThirdLevel, title, std::move(details), this));
-            return true;
-        }
-        default:
-            return false;
-    }
+    const Screen* const top = current();
+    if (top->model() == nullptr || !top->model()->indexPath(index)) return false;
+    const std::optional<Cell> tapped = top->model()->cellAt(index);
+    if (!tapped) return false;
+    std::optional<Destination> next = top->controller().open(*tapped);
+    if (!next) return false;
+    std::optional<Chart> charted;
+    if (validator_->history())
+        if (const auto category = next->controller->shownCategory())
+            charted = chartForCategory(*category);
+    push(new Screen(QString::fromStdString(next->title), std::move(next->controller), charted,
+                    this));
+    return true;
+}
+
+bool Navigator::openChart() {
+    const Screen* const top = current();
+    const std::shared_ptr<const History> history = validator_->history();
+    if (!top->chartOffered() || !history) return false;
+    const Chart chart = *top->chartOffered();
+    push(new Screen(QString::fromUtf8(chartTitle(chart)), new ChartModel(history, chart), this));
+    return true;
 }
 
 void Navigator::push(Screen* screen) {
@@ -117,6 +110,7 @@ void Navigator::popToRoot() {
 bool Navigator::open(const QStringList& titles) {
     popToRoot();
     for (const QString& title : titles) {
+        if (current()->model() == nullptr) return false;
         const TableModel& model = *current()->model();
         int found = -1;
         for (int i = 0; i < model.count() && found < 0; ++i) {

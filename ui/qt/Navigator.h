@@ -8,47 +8,59 @@
 #include <QStringList>
 
 #include <memory>
+#include <optional>
 #include <vector>
 
 #include "metrics/MetricValidator.h"
+#include "metrics/history/Chart.h"
 #include "ui/TableController.h"
+#include "ui/qt/ChartModel.h"
 #include "ui/qt/TableModel.h"
 
 namespace pyx::qt {
 
-// One screen on the stack: its controller, the model the view draws, and its title.
+// One screen on the stack, with its title: a table (its controller and the model the view
+// draws) or a chart page (its chart model).
 class Screen : public QObject {
     Q_OBJECT
     Q_PROPERTY(QString title READ title CONSTANT)
     Q_PROPERTY(pyx::qt::TableModel* model READ model CONSTANT)
-    Q_PROPERTY(int level READ level CONSTANT)
     Q_PROPERTY(bool refreshes READ refreshes CONSTANT)
     Q_PROPERTY(bool leadsFurther READ leadsFurther CONSTANT)
+    Q_PROPERTY(bool charted READ charted CONSTANT)
+    Q_PROPERTY(pyx::qt::ChartModel* chart READ chart CONSTANT)
 
   public:
-    enum Level { Launch = 0, FirstLevel = 1, SecondLevel = 2, ThirdLevel = 3 };
-    Q_ENUM(Level)
-
-    Screen(Level level, QString title, std::shared_ptr<TableController> controller,
-           QObject* parent = nullptr);
+    // A table; charted: the chart page it offers, if any.
+    Screen(QString title, std::shared_ptr<TableController> controller,
+           std::optional<Chart> charted = std::nullopt, QObject* parent = nullptr);
+    // A chart page drawing chart (which the screen takes as its child).
+    Screen(QString title, ChartModel* chart, QObject* parent = nullptr);
 
     [[nodiscard]] QString title() const { return title_; }
+    // The table's model; null for a chart page.
     [[nodiscard]] TableModel* model() const { return model_; }
-    [[nodiscard]] int level() const { return level_; }
-    // The category screen follows the store: the view reloads it periodically.
-    [[nodiscard]] bool refreshes() const { return level_ == SecondLevel; }
-    // Whether tapping a row opens a further screen.
-    [[nodiscard]] bool leadsFurther() const { return level_ != ThirdLevel; }
+    // A screen that shows the store: the view reloads it periodically.
+    [[nodiscard]] bool refreshes() const { return controller_ && controller_->followsStore(); }
+    // Whether its rows are menu entries leading to a further list.
+    [[nodiscard]] bool leadsFurther() const { return controller_ && controller_->leadsFurther(); }
+    // Whether the table offers a chart page (a button in the title bar).
+    [[nodiscard]] bool charted() const { return charted_.has_value(); }
+    [[nodiscard]] const std::optional<Chart>& chartOffered() const { return charted_; }
+    // The chart page's model; null for a table.
+    [[nodiscard]] ChartModel* chart() const { return chart_; }
+    // The table's controller; only for a table.
     [[nodiscard]] TableController& controller() const { return *controller_; }
 
     // The periodic refresh: posts one reload of the table to the main queue.
     Q_INVOKABLE void update();
 
   private:
-    Level level_;
     QString title_;
     std::shared_ptr<TableController> controller_;
-    TableModel* model_;
+    TableModel* model_ = nullptr;
+    std::optional<Chart> charted_;
+    ChartModel* chart_ = nullptr;
 };
 
 class Navigator : public QObject {
@@ -75,9 +87,13 @@ class Navigator : public QObject {
     [[nodiscard]] bool animated() const { return animated_; }
     void setAnimated(bool animated);
 
-    // The tap on item index of the top screen: pushes the next screen. False for a header,
-    // an index out of range, or the deepest screen.
+    // The tap on item index of the top screen: pushes the screen its controller opens. False
+    // for a header, an index out of range, or a screen whose rows open nothing.
     Q_INVOKABLE bool select(int index);
+    // Whether category screens offer chart pages (the store keeps a history).
+    [[nodiscard]] bool chartsOffered() const { return validator_->history() != nullptr; }
+    // Pushes the chart page of the top screen; false when it offers none.
+    Q_INVOKABLE bool openChart();
     // Pops the top screen; false on the launch list.
     Q_INVOKABLE bool back();
     Q_INVOKABLE void popToRoot();

@@ -4,6 +4,7 @@
 
 #include <mutex>
 
+#include "ui/qt/ChartModel.h"
 #include "ui/qt/Navigator.h"
 #include "ui/qt/TableModel.h"
 
@@ -16,6 +17,7 @@ void registerQmlTypes() {
         qmlRegisterUncreatableType<Navigator>("Pyxon", 1, 0, "Navigator", made);
         qmlRegisterUncreatableType<Screen>("Pyxon", 1, 0, "Screen", made);
         qmlRegisterUncreatableType<TableModel>("Pyxon", 1, 0, "TableModel", made);
+        qmlRegisterUncreatableType<ChartModel>("Pyxon", 1, 0, "ChartModel", made);
     });
 }
 

@@ -1,7 +1,7 @@
 #include "ui/qt/QtFrontEnd.h"
 
+#include <QApplication>
 #include <QDir>
-#include <QGuiApplication>
 #include <QMetaObject>
 #include <QQmlApplicationEngine>
 #include <QQuickStyle>
@@ -46,9 +46,10 @@ int runWindow(int& argc, char** argv, const WindowOptions& options,
     if (options.screenshotDir && !displayAvailable()) qputenv("QT_QPA_PLATFORM", "offscreen");
     if (offscreenPlatform()) QQuickWindow::setGraphicsApi(QSGRendererInterface::Software);
 
-    const QGuiApplication app(argc, argv);
-    QGuiApplication::setApplicationName(QStringLiteral("Pyxon"));
-    QGuiApplication::setApplicationDisplayName(QStringLiteral("Pyxon"));
+    // A widgets application: the chart pages' Qt Charts types draw through Qt Widgets.
+    const QApplication app(argc, argv);
+    QApplication::setApplicationName(QStringLiteral("Pyxon"));
+    QApplication::setApplicationDisplayName(QStringLiteral("Pyxon"));
     QQuickStyle::setStyle(QStringLiteral("Basic"));
     const qt::MainQueueBridge bridge;
     qt::registerQmlTypes();
@@ -81,13 +82,24 @@ int runWindow(int& argc, char** argv, const WindowOptions& options,
             systemLog("pyxon: cannot create the screenshot folder " + *options.screenshotDir);
             return 1;
         }
-        screenshots = std::make_unique<qt::Screenshots>(navigator, *window, folder);
+        screenshots = std::make_unique<qt::Screenshots>(navigator, *window, folder,
+                                                        options.screenshotChartDelayMs);
         QObject::connect(screenshots.get(), &qt::Screenshots::finished, &app,
-                         [](int status) { QGuiApplication::exit(status); });
+                         [](int status) { QApplication::exit(status); });
         QTimer::singleShot(options.screenshotDelayMs, screenshots.get(),
                            [&screenshots] { screenshots->start(); });
     }
-    return QGuiApplication::exec();
+    if (options.chart && !options.screenshotDir) {
+        const QStringList path{QString::fromStdString(options.chart->first),
+                               QString::fromStdString(options.chart->second)};
+        QTimer::singleShot(0, &navigator, [&navigator, path] {
+            navigator.setAnimated(false);
+            if (!navigator.open(path) || !navigator.openChart())
+                systemLog("pyxon: cannot open the chart of " + path.join(" / ").toStdString());
+            navigator.setAnimated(true);
+        });
+    }
+    return QApplication::exec();
 }
 
 }  // namespace pyx

@@ -4,6 +4,7 @@
 #include <functional>
 #include <optional>
 #include <string>
+#include <utility>
 
 namespace pyx {
 
@@ -12,6 +13,10 @@ struct WindowOptions {
     // category screen of the menu to PNG files in this folder, then quit with 0.
     std::optional<std::string> screenshotDir;
     int screenshotDelayMs = 3000;
+    // The pause before the chart pages are rendered, so that their lines are long.
+    int screenshotChartDelayMs = 5000;
+    // When set: the chart page of this (group, category) screen is opened at start.
+    std::optional<std::pair<std::string, std::string>> chart;
 };
 
 // Creates the application, lets its event loop drain the main queue, shows the window, calls

@@ -4,6 +4,7 @@
 #include <QTimer>
 
 #include "core/Log.h"
+#include "ui/ChartScreens.h"
 #include "ui/PyxViewItems.h"
 
 namespace pyx::qt {
@@ -11,6 +12,8 @@ namespace {
 
 // Time for the view to lay out a pushed screen before it is grabbed.
 constexpr int kSettleMs = 100;
+// A chart page draws its panels once laid out: a little longer.
+constexpr int kChartSettleMs = 400;
 
 QString slug(const QString& title) {
     QString out;
@@ -21,8 +24,14 @@ QString slug(const QString& title) {
 }  // namespace
 
 Screenshots::Screenshots(Navigator& navigator, QQuickWindow& window, const QDir& folder,
-                         QObject* parent)
-    : QObject(parent), navigator_(navigator), window_(window), folder_(folder), paths_(paths()) {}
+                         int chartDelayMs, QObject* parent)
+    : QObject(parent),
+      navigator_(navigator),
+      window_(window),
+      folder_(folder),
+      paths_(paths()),
+      chartDelayMs_(chartDelayMs),
+      charts_(chartNumbers()) {}
 
 std::vector<QStringList> Screenshots::paths() {
     const PyxViewItems& items = sharedPyxViewItems();
@@ -35,10 +44,20 @@ std::vector<QStringList> Screenshots::paths() {
     return out;
 }
 
-QString Screenshots::fileName(int number, const QStringList& path) {
+std::vector<int> Screenshots::chartNumbers() {
+    const auto all = paths();
+    std::vector<int> out;
+    for (std::size_t i = 0; i < all.size(); ++i)
+        if (all[i].size() == 2 && chartForCategory(all[i].join(' ').toStdString()))
+            out.push_back(static_cast<int>(i) + 1);
+    return out;
+}
+
+QString Screenshots::fileName(int number, const QStringList& path, bool chart) {
     QStringList parts{QStringLiteral("%1").arg(number, 2, 10, QChar('0'))};
     if (path.isEmpty()) parts << QStringLiteral("launch");
     for (const QString& title : path) parts << slug(title);
+    if (chart) parts << QStringLiteral("chart");
     return parts.join('-') + QStringLiteral(".png");
 }
 
@@ -49,7 +68,13 @@ void Screenshots::start() {
 
 void Screenshots::next() {
     if (done_ == paths_.size()) {
-        emit finished(0);
+        // The charts come last, after a pause in which the history grows.
+        inCharts_ = true;
+        if (charts_.empty() || !navigator_.chartsOffered()) {
+            emit finished(0);
+            return;
+        }
+        QTimer::singleShot(chartDelayMs_, this, &Screenshots::nextChart);
         return;
     }
     if (!navigator_.open(paths_[done_])) {
@@ -60,16 +85,43 @@ void Screenshots::next() {
     QTimer::singleShot(kSettleMs, this, &Screenshots::shoot);
 }
 
+void Screenshots::nextChart() {
+    if (chartsDone_ == charts_.size()) {
+        emit finished(0);
+        return;
+    }
+    const QStringList& path = paths_[static_cast<std::size_t>(charts_[chartsDone_] - 1)];
+    if (!navigator_.open(path) || !navigator_.openChart()) {
+        systemLog("pyxon: cannot open the chart of " + path.join(" / ").toStdString());
+        emit finished(1);
+        return;
+    }
+    QTimer::singleShot(kChartSettleMs, this, &Screenshots::shoot);
+}
+
 void Screenshots::shoot() {
-    const QString file = folder_.filePath(fileName(static_cast<int>(done_) + 1, paths_[done_]));
+    if (inCharts_) {
+        const int number = charts_[chartsDone_];
+        if (!save(folder_.filePath(
+                fileName(number, paths_[static_cast<std::size_t>(number - 1)], true))))
+            return;
+        ++chartsDone_;
+        nextChart();
+        return;
+    }
+    if (!save(folder_.filePath(fileName(static_cast<int>(done_) + 1, paths_[done_])))) return;
+    ++done_;
+    next();
+}
+
+bool Screenshots::save(const QString& file) {
     const QImage image = window_.grabWindow();
     if (image.isNull() || !image.save(file, "PNG")) {
         systemLog("pyxon: cannot write the screenshot " + file.toStdString());
         emit finished(1);
-        return;
+        return false;
     }
-    ++done_;
-    next();
+    return true;
 }
 
 }  // namespace pyx::qt

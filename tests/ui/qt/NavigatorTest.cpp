@@ -13,6 +13,7 @@
 
 #include "../StoreFeed.h"
 #include "core/MainQueue.h"
+#include "metrics/history/History.h"
 #include "ui/FirstLevelViewController.h"
 #include "ui/SecondLevelViewController.h"
 #include "ui/ThirdLevelViewController.h"
@@ -40,7 +41,6 @@ class NavigatorTest : public ::testing::Test {
 TEST_F(NavigatorTest, StartsOnTheLaunchList) {
     EXPECT_EQ(navigator.depth(), 1);
     Screen* launch = navigator.current();
-    EXPECT_EQ(launch->level(), Screen::Launch);
     EXPECT_EQ(launch->title(), "Pyxon");
     EXPECT_FALSE(launch->refreshes());
     EXPECT_TRUE(launch->leadsFurther());
@@ -58,11 +58,12 @@ TEST_F(NavigatorTest, TappingAGroupPushesItsMenuTitledByTheGroup) {
     Screen* menu = navigator.current();
     EXPECT_EQ(pushed.at(0).at(0).value<Screen*>(), menu);
     EXPECT_EQ(menu->title(), "LTE");
-    EXPECT_EQ(menu->level(), Screen::FirstLevel);
+    EXPECT_TRUE(menu->leadsFurther());
+    EXPECT_FALSE(menu->refreshes());
     EXPECT_EQ(menu->model()->count(), 14);
     const auto& controller = dynamic_cast<FirstLevelViewController&>(menu->controller());
     EXPECT_EQ(controller.seguedThroughRow(), "LTE");
-    EXPECT_EQ(controller.myMetricValidator(), store);
+    EXPECT_EQ(&controller.myMetricValidator(), store.get());
 }
 
 TEST_F(NavigatorTest, UmtsThenTxPowerOpensTheCategoryScreenWithThatPair) {
@@ -71,10 +72,12 @@ TEST_F(NavigatorTest, UmtsThenTxPowerOpensTheCategoryScreenWithThatPair) {
     Screen* screen = navigator.current();
     EXPECT_EQ(screen->title(), "Tx Power");
     EXPECT_TRUE(screen->refreshes());
+    // Its rows open the placeholder, but they are entries, not menu items: no chevron.
+    EXPECT_FALSE(screen->leadsFurther());
     const auto& controller = dynamic_cast<SecondLevelViewController&>(screen->controller());
     EXPECT_EQ(controller.firstSelection(), "UMTS");
     EXPECT_EQ(controller.seguedThroughRow(), "Tx Power");
-    EXPECT_EQ(controller.myMetricValidator(), store);
+    EXPECT_EQ(&controller.myMetricValidator(), store.get());
 }
 
 TEST_F(NavigatorTest, OpeningAnUnknownTitleStopsThere) {
@@ -90,7 +93,6 @@ TEST_F(NavigatorTest, TappingACategoryRowOpensTheThirdLevelPlaceholder) {
     ASSERT_TRUE(navigator.select(0));
     EXPECT_EQ(navigator.depth(), 4);
     Screen* details = navigator.current();
-    EXPECT_EQ(details->level(), Screen::ThirdLevel);
     EXPECT_EQ(details->title(), "rrc_state");
     EXPECT_FALSE(details->refreshes());
     EXPECT_FALSE(details->leadsFurther());
@@ -224,6 +226,38 @@ TEST(ScreenshotPlan, CoversTheLaunchListEveryGroupAndEveryMenuPair) {
     EXPECT_EQ(Screenshots::fileName(1, {}), "01-launch.png");
     EXPECT_EQ(Screenshots::fileName(17, {"LTE", "C-DRX"}), "17-lte-c-drx.png");
     EXPECT_EQ(Screenshots::fileName(44, {"GSM", "GSM GPRS Config"}), "44-gsm-gsm-gprs-config.png");
+}
+
+TEST(ScreenshotPlan, ChartPagesAreNamedAfterTheirScreen) {
+    const auto charts = Screenshots::chartNumbers();
+    ASSERT_EQ(charts.size(), 11U);
+    EXPECT_EQ(charts.front(), 12);
+    EXPECT_EQ(Screenshots::fileName(12, {"LTE", "Serving Cell Meas"}, true),
+              "12-lte-serving-cell-meas-chart.png");
+}
+
+TEST_F(NavigatorTest, ScreensOfMeasuredQuantitiesOpenTheirChartWhenTheStoreKeepsAHistory) {
+    ASSERT_TRUE(navigator.open({"LTE", "Serving Cell Meas"}));
+    EXPECT_FALSE(navigator.current()->charted());  // no history kept
+    EXPECT_FALSE(navigator.openChart());
+
+    store->setHistory(std::make_shared<History>());
+    ASSERT_TRUE(navigator.open({"LTE", "Serving Cell Meas"}));
+    EXPECT_TRUE(navigator.current()->charted());
+    ASSERT_TRUE(navigator.openChart());
+    Screen* chart = navigator.current();
+    EXPECT_EQ(navigator.depth(), 4);
+    EXPECT_EQ(chart->title(), "LTE serving");
+    ASSERT_NE(chart->chart(), nullptr);
+    EXPECT_EQ(chart->model(), nullptr);
+    EXPECT_FALSE(chart->refreshes());
+    EXPECT_FALSE(chart->charted());
+    EXPECT_FALSE(navigator.select(0));
+    EXPECT_FALSE(navigator.openChart());
+    EXPECT_TRUE(chart->chart()->empty());
+
+    ASSERT_TRUE(navigator.open({"LTE", "C-DRX"}));
+    EXPECT_FALSE(navigator.current()->charted());
 }
 
 TEST(ScreenshotPlan, EveryPlannedScreenCanBeOpened) {

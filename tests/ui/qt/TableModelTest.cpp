@@ -115,7 +115,7 @@ TEST(TableModel, PassesTheModelTesterThroughGrowingChangingAndShrinkingReloads) 
 TEST(TableModel, PassesTheModelTesterOverTheCategoryScreen) {
     const test::WarningCatcher catcher;
     const auto store = test::emptyStore();
-    auto screen = std::make_shared<SecondLevelViewController>(store);
+    auto screen = std::make_shared<SecondLevelViewController>(*store);
     screen->setFirstSelection("LTE");
     screen->setSeguedThroughRow("EUTRA Neighbor Info");
     TableModel model(screen);

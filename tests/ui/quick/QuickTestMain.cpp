@@ -1,5 +1,7 @@
 // Qt Quick Test runner for the window's QML: a navigator over a store of its own (as
-// "testNavigator") and a way to put metrics into that store (as "testStore").
+// "testNavigator") and a way to put metrics into that store and its history (as
+// "testStore"). A widgets application, as the window's: the chart pages need one.
+#include <QApplication>
 #include <QObject>
 #include <QQmlContext>
 #include <QQmlEngine>
@@ -11,6 +13,7 @@
 #include <memory>
 
 #include "metrics/MetricValidator.h"
+#include "metrics/history/History.h"
 #include "ui/qt/MainQueueBridge.h"
 #include "ui/qt/Navigator.h"
 #include "ui/qt/QmlTypes.h"
@@ -29,8 +32,27 @@ class TestStore : public QObject {
     Q_INVOKABLE bool setDictionary(const QString& property, const QVariantList& fields) {
         const auto p = pyx::MetricValidator::dictionaryPropertyNamed(property.toStdString());
         if (!p || fields.size() % 2 != 0) return false;
+        store_->setDictionary(*p, dictionaryOf(fields));
+        return true;
+    }
+    // One arrival of that dictionary at timeMs (ms since 1970), for the history.
+    Q_INVOKABLE bool record(const QString& property, const QVariantList& fields, double timeMs) {
+        const auto p = pyx::MetricValidator::dictionaryPropertyNamed(property.toStdString());
+        if (!p || fields.size() % 2 != 0 || !store_->history()) return false;
+        store_->history()->record(*p, dictionaryOf(fields), timeMs);
+        return true;
+    }
+    // Starts the history afresh (chart pages opened later read the new one).
+    Q_INVOKABLE void clearHistory() { store_->setHistory(std::make_shared<pyx::History>()); }
+    Q_INVOKABLE void clear(const QString& property) {
+        if (const auto p = pyx::MetricValidator::dictionaryPropertyNamed(property.toStdString()))
+            store_->setDictionary(*p, std::nullopt);
+    }
+
+  private:
+    static pyx::Dict dictionaryOf(const QVariantList& fields) {
         pyx::Dict dict;
-        for (qsizetype i = 0; i < fields.size(); i += 2) {
+        for (qsizetype i = 0; i + 1 < fields.size(); i += 2) {
             const QVariant& value = fields.at(i + 1);
             const std::string key = fields.at(i).toString().toStdString();
             if (value.typeId() == QMetaType::QString)
@@ -38,15 +60,9 @@ class TestStore : public QObject {
             else
                 dict.set(key, pyx::Value(static_cast<std::int64_t>(value.toLongLong())));
         }
-        store_->setDictionary(*p, std::move(dict));
-        return true;
-    }
-    Q_INVOKABLE void clear(const QString& property) {
-        if (const auto p = pyx::MetricValidator::dictionaryPropertyNamed(property.toStdString()))
-            store_->setDictionary(*p, std::nullopt);
+        return dict;
     }
 
-  private:
     std::shared_ptr<pyx::MetricValidator> store_;
 };
 
@@ -61,6 +77,7 @@ class Setup : public QObject {
     }
     void qmlEngineAvailable(QQmlEngine* engine) {
         auto store = pyx::MetricValidator::create(nullptr);
+        store->setHistory(std::make_shared<pyx::History>());
         auto navigator = std::make_unique<pyx::qt::Navigator>(store);
         auto testStore = std::make_unique<TestStore>(store);
         engine->rootContext()->setContextProperty("testNavigator", navigator.get());
@@ -82,6 +99,11 @@ class Setup : public QObject {
 
 }  // namespace
 
-QUICK_TEST_MAIN_WITH_SETUP(ui_quick_tests, Setup)
+int main(int argc, char** argv) {
+    QQuickWindow::setGraphicsApi(QSGRendererInterface::Software);
+    const QApplication app(argc, argv);
+    Setup setup;
+    return quick_test_main_with_setup(argc, argv, "ui_quick_tests", nullptr, &setup);
+}
 
 #include "QuickTestMain.moc"

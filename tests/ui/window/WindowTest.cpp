@@ -10,6 +10,8 @@
 #include <string>
 #include <vector>
 
+#include "metrics/MetricValidator.h"
+#include "metrics/history/History.h"
 #include "ui/qt/QtFrontEnd.h"
 #include "ui/qt/Screenshots.h"
 
@@ -44,9 +46,11 @@ TEST(Window, ScreenshotModeRendersEveryScreenThenQuitsWithZero) {
     std::vector<char*> argv{name.data(), nullptr};
     int argc = 1;
     int rootViewLoads = 0;
+    MetricValidator::sharedInstance()->setHistory(std::make_shared<History>());
     WindowOptions options;
     options.screenshotDir = dir.string();
     options.screenshotDelayMs = 0;
+    options.screenshotChartDelayMs = 0;
     const int status = runWindow(argc, argv.data(), options, [&rootViewLoads] { ++rootViewLoads; });
 
     EXPECT_EQ(status, 0);
@@ -57,7 +61,14 @@ TEST(Window, ScreenshotModeRendersEveryScreenThenQuitsWithZero) {
         (void)entry;
         ++files;
     }
-    EXPECT_EQ(files, paths.size());
+    const auto charts = qt::Screenshots::chartNumbers();
+    EXPECT_EQ(files, paths.size() + charts.size());
+    for (const int number : charts) {
+        const auto file = dir / qt::Screenshots::fileName(
+                                    number, paths[static_cast<std::size_t>(number - 1)], true)
+                                    .toStdString();
+        EXPECT_EQ(pngSize(file).width, 390U) << file;
+    }
     for (std::size_t i = 0; i < paths.size(); ++i) {
         const auto file =
             dir / qt::Screenshots::fileName(static_cast<int>(i) + 1, paths[i]).toStdString();

@@ -1,0 +1,215 @@
+#include "metrics/history/History.h"
+
+#include <algorithm>
+#include <chrono>
+#include <cmath>
+#include <limits>
+#include <stdexcept>
+
+namespace pyx {
+namespace {
+
+double systemClockMs() {
+    return std::chrono::duration<double, std::milli>(
+               std::chrono::system_clock::now().time_since_epoch())
+        .count();
+}
+
+std::optional<float> numberAt(const Dict& dict, std::string_view key) {
+    const Value* value = dict.find(key);
+    if (value == nullptr || !value->isNumber() || value->isBool()) return std::nullopt;
+    const auto number = value->toFloat();
+    if (!number || !std::isfinite(*number)) return std::nullopt;
+    return number;
+}
+
+std::int64_t keyAt(const Dict& dict, std::string_view key) {
+    if (key.empty()) return -1;
+    const Value* value = dict.find(key);
+    if (value == nullptr) return -1;
+    return value->toInt64().value_or(-1);
+}
+
+const Array* listAt(const Dict& dict, std::string_view key) {
+    const Value* value = dict.find(key);
+    return value != nullptr && value->isArray() ? &value->asArray() : nullptr;
+}
+
+}  // namespace
+
+History::History() : History(Limits{}) {}
+
+History::History(Limits limits, Clock clock)
+    : limits_(limits),
+      clock_(clock ? std::move(clock) : Clock(systemClockMs)),
+      perQuantity_(historyQuantities().size(), 0),
+      single_(historyQuantities().size(), nullptr),
+      byProperty_(MetricValidator::kDictionaryPropertyCount) {
+    if (limits_.pointsPerSeries == 0 || !(limits_.windowMs > 0) || limits_.seriesPerQuantity == 0)
+        throw std::invalid_argument(
+            "History: the window, the points per series and the series "
+            "per quantity must be above zero");
+    strongest_.reserve(64);
+    const auto quantities = historyQuantities();
+    for (std::size_t i = 0; i < quantities.size(); ++i)
+        byProperty_[static_cast<std::size_t>(quantities[i].property)].push_back(i);
+}
+
+bool History::feeds(Chart chart, MetricValidator::DictionaryProperty property) {
+    const auto quantities = historyQuantities();
+    return std::any_of(quantities.begin(), quantities.end(), [&](const Quantity& q) {
+        return q.chart == chart && q.property == property;
+    });
+}
+
+double History::timeOf(std::optional<double> eventTimeMs) const {
+    if (eventTimeMs && std::isfinite(*eventTimeMs) && *eventTimeMs > 0) return *eventTimeMs;
+    return clock_();
+}
+
+void History::startSession(double timeMs) {
+    for (const auto& series : series_) series->clear();
+    newestMs_ = timeMs;
+    ++session_;
+}
+
+void History::record(MetricValidator::DictionaryProperty property, const Dict& stored,
+                     std::optional<double> eventTimeMs) {
+    const auto& read = byProperty_[static_cast<std::size_t>(property)];
+    if (read.empty()) return;
+    const double timeMs = timeOf(eventTimeMs);
+    ++revision_;
+    if (newestMs_ && timeMs + limits_.backwardsToleranceMs < *newestMs_)
+        startSession(timeMs);
+    else if (!newestMs_ || timeMs > *newestMs_)
+        newestMs_ = timeMs;
+    for (const std::size_t quantity : read) add(quantity, stored, timeMs);
+}
+
+void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
+    const Quantity& q = historyQuantities()[quantity];
+    switch (q.pick) {
+        case Pick::Field: {
+            const Dict* holder = &stored;
+            if (!q.container.empty()) {
+                const Value* nested = stored.find(q.container);
+                if (nested == nullptr || !nested->isDict()) return;
+                holder = &nested->asDict();
+            }
+            if (const auto value = numberAt(*holder, q.field))
+                singleFor(quantity).add(timeMs, *value);
+            return;
+        }
+        case Pick::FirstEntry: {
+            const Array* list = listAt(stored, q.container);
+            if (list == nullptr || list->empty() || !list->front().isDict()) return;
+            if (const auto value = numberAt(list->front().asDict(), q.field))
+                singleFor(quantity).add(timeMs, *value);
+            return;
+        }
+        case Pick::EachEntry: {
+            const Array* list = listAt(stored, q.container);
+            if (list == nullptr) return;
+            for (const Value& entry : *list) {
+                if (!entry.isDict()) continue;
+                if (const auto value = numberAt(entry.asDict(), q.field))
+                    addEntry(quantity, entry.asDict(), *value, timeMs);
+            }
+            return;
+        }
+        case Pick::Strongest: {
+            const Array* list = listAt(stored, q.container);
+            if (list == nullptr) return;
+            strongest_.clear();
+            for (const Value& entry : *list) {
+                if (!entry.isDict()) continue;
+                const auto rank = numberAt(entry.asDict(), q.rankField);
+                if (rank) strongest_.emplace_back(*rank, &entry.asDict());
+            }
+            const std::size_t kept = std::min(kStrongestNeighbours, strongest_.size());
+            std::partial_sort(strongest_.begin(), strongest_.begin() + static_cast<long>(kept),
+                              strongest_.end(),
+                              [](const auto& x, const auto& y) { return x.first > y.first; });
+            for (std::size_t i = 0; i < kept; ++i) {
+                const Dict& entry = *strongest_[i].second;
+                if (const auto value = numberAt(entry, q.field))
+                    addEntry(quantity, entry, *value, timeMs);
+            }
+            return;
+        }
+    }
+}
+
+void History::addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs) {
+    const Quantity& q = historyQuantities()[quantity];
+    seriesFor(SeriesKey{quantity, keyAt(entry, q.keyA), keyAt(entry, q.keyB)}).add(timeMs, value);
+}
+
+Series& History::singleFor(std::size_t quantity) {
+    Series*& single = single_[quantity];
+    if (single == nullptr) single = &seriesFor(SeriesKey{quantity});
+    return *single;
+}
+
+Series& History::seriesFor(SeriesKey key) {
+    if (const auto found = index_.find(key); found != index_.end()) return *found->second;
+    if (perQuantity_[key.quantity] < limits_.seriesPerQuantity) {
+        const double slotMs = limits_.windowMs / static_cast<double>(limits_.pointsPerSeries);
+        series_.push_back(std::make_unique<Series>(key, limits_.pointsPerSeries, slotMs));
+        ++perQuantity_[key.quantity];
+        index_.emplace(key, series_.back().get());
+        return *series_.back();
+    }
+    // Full: the series of this quantity fed longest ago gives way.
+    Series* stalest = nullptr;
+    double stalestMs = std::numeric_limits<double>::infinity();
+    for (const auto& series : series_) {
+        if (series->key().quantity != key.quantity) continue;
+        const double newest = series->points().empty() ? -std::numeric_limits<double>::infinity()
+                                                       : series->points().newest().timeMs;
+        if (newest < stalestMs) {
+            stalestMs = newest;
+            stalest = series.get();
+        }
+    }
+    // The index keeps its node: re-keyed in place, nothing is allocated.
+    auto node = index_.extract(stalest->key());
+    stalest->rekey(key);
+    node.key() = key;
+    index_.insert(std::move(node));
+    return *stalest;
+}
+
+std::vector<const Series*> History::seriesOf(Chart chart, double fromMs) const {
+    std::vector<const Series*> out;
+    for (const auto& series : series_)
+        if (series->quantity().chart == chart && !series->points().empty() &&
+            series->points().newest().timeMs >= fromMs)
+            out.push_back(series.get());
+    // Per-entry quantities ranked by strength: the strongest last values first, and no more
+    // of them than an arrival keeps.
+    std::sort(out.begin(), out.end(), [](const Series* x, const Series* y) {
+        const SeriesKey& a = x->key();
+        const SeriesKey& b = y->key();
+        if (a.quantity != b.quantity) return a.quantity < b.quantity;
+        if (x->quantity().pick == Pick::Strongest) {
+            const float lx = x->points().newest().last;
+            const float ly = y->points().newest().last;
+            if (lx != ly) return lx > ly;
+        }
+        if (a.a != b.a) return a.a < b.a;
+        return a.b < b.b;
+    });
+    std::vector<const Series*> kept;
+    kept.reserve(out.size());
+    std::size_t ofQuantity = 0;
+    for (std::size_t i = 0; i < out.size(); ++i) {
+        ofQuantity =
+            i > 0 && out[i - 1]->key().quantity == out[i]->key().quantity ? ofQuantity + 1 : 0;
+        if (out[i]->quantity().pick != Pick::Strongest || ofQuantity < kStrongestNeighbours)
+            kept.push_back(out[i]);
+    }
+    return kept;
+}
+
+}  // namespace pyx

@@ -1,0 +1,49 @@
+// One charted line: a quantity, for one entity where the quantity has several (a carrier, a
+// neighbour), with its points.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+
+#include "metrics/history/Quantity.h"
+#include "metrics/history/SeriesRing.h"
+
+namespace pyx {
+
+// Which line: the quantity's place in historyQuantities() and, for per-entry quantities, the
+// entry's key fields (-1 when unused).
+struct SeriesKey {
+    std::size_t quantity = 0;
+    std::int64_t a = -1;
+    std::int64_t b = -1;
+    friend bool operator==(const SeriesKey&, const SeriesKey&) = default;
+};
+
+class Series {
+  public:
+    Series(SeriesKey key, std::size_t capacity, double slotMs);
+
+    [[nodiscard]] const SeriesKey& key() const { return key_; }
+    [[nodiscard]] const Quantity& quantity() const;
+    // The entity: "CC 1", "ARFCN 58", "6300/118" (EARFCN/PCI); empty for a quantity of the
+    // serving cell.
+    [[nodiscard]] const std::string& entity() const { return entity_; }
+    // What a legend says: "RSRP avg", "CC 1 RSRQ", "6300/118".
+    [[nodiscard]] std::string label() const;
+    [[nodiscard]] const SeriesRing& points() const { return ring_; }
+
+    // Reuses the series for another key; its points are dropped.
+    void rekey(SeriesKey key);
+    void add(double timeMs, float value) { ring_.add(timeMs, value); }
+    void clear() { ring_.clear(); }
+
+  private:
+    void describe();
+
+    SeriesKey key_;
+    std::string entity_;
+    SeriesRing ring_;
+};
+
+}  // namespace pyx

@@ -1,0 +1,182 @@
+#include "sources/replay/ReplayTransport.h"
+
+#include <chrono>
+#include <cmath>
+#include <stdexcept>
+#include <utility>
+
+#include "baseband/velk/Names.h"
+#include "core/Format.h"
+#include "core/Log.h"
+#include "recordings/RecordingError.h"
+
+namespace pyx::replay {
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+double checkedSpeed(double speed) {
+    if (std::isnan(speed) || speed < 0.0)
+        throw std::invalid_argument(
+            format("the replay speed must be 0 (as fast as taken) or more, not %g", speed));
+    return speed;
+}
+
+}  // namespace
+
+ReplayTransport::ReplayTransport(Options options)
+    : options_{std::move(options.file),    checkedSpeed(options.speed), options.loop,
+               std::move(options.backlog), options.maxBacklog,          std::move(options.onEnd)},
+      reader_(options_.file) {}
+
+ReplayTransport::~ReplayTransport() {
+    stopThread();
+}
+
+velk::Result ReplayTransport::performCommand(const std::string& command, const Value& input,
+                                             Value* output) {
+    static_cast<void>(input);
+    static_cast<void>(output);
+    if (command == velk::kCommandAddConfiguration) {
+        const std::lock_guard lock(mutex_);
+        configured_ = true;
+    }
+    return velk::Result(velk::kCodeSuccess, "Success");
+}
+
+void ReplayTransport::startEvents(EventSink sink) {
+    const std::lock_guard control(controlMutex_);
+    stopThread();
+    {
+        const std::lock_guard lock(mutex_);
+        if (!configured_ && !playing_) return;
+        playing_ = true;
+    }
+    thread_ = std::jthread(
+        [this, sink = std::move(sink)](const std::stop_token& stop) { run(stop, sink); });
+}
+
+void ReplayTransport::stopEvents() {
+    const std::lock_guard control(controlMutex_);
+    stopThread();
+}
+
+void ReplayTransport::stopThread() {
+    if (!thread_.joinable()) return;
+    thread_.request_stop();
+    thread_.join();
+}
+
+std::uint64_t ReplayTransport::played() const {
+    const std::lock_guard lock(mutex_);
+    return played_;
+}
+
+bool ReplayTransport::finished() const {
+    const std::lock_guard lock(mutex_);
+    return finished_;
+}
+
+bool ReplayTransport::waitForRoom(const std::stop_token& stop) {
+    if (!options_.backlog) return !stop.stop_requested();
+    while (options_.backlog() > options_.maxBacklog) {
+        std::unique_lock lock(waitMutex_);
+        if (wake_.wait_for(lock, stop, std::chrono::microseconds(200), [] { return false; }) ||
+            stop.stop_requested())
+            return false;
+    }
+    return !stop.stop_requested();
+}
+
+void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
+    const bool timed = options_.speed > 0.0 && std::isfinite(options_.speed);
+    for (;;) {
+        std::int64_t after = 0;
+        {
+            const std::lock_guard lock(mutex_);
+            after = position_;
+        }
+        // Timing starts afresh at every start, pass and session: monotonic times of different
+        // runs are not comparable.
+        std::int64_t session = -1;
+        std::int64_t firstMono = 0;
+        Clock::time_point start;
+        bool stopped = false;
+        std::uint64_t thisPass = 0;
+        try {
+            recordings::RecordingReader::Filter filter;
+            filter.afterID = after;
+            reader_.forEach(filter, [&](recordings::RecordedEvent& event) {
+                if (timed) {
+                    if (event.session != session || event.monoNs < firstMono) {
+                        session = event.session;
+                        firstMono = event.monoNs;
+                        start = Clock::now();
+                    }
+                    const auto offset = std::chrono::duration<double, std::nano>(
+                        static_cast<double>(event.monoNs - firstMono) / options_.speed);
+                    const auto due = start + std::chrono::duration_cast<Clock::duration>(offset);
+                    std::unique_lock lock(waitMutex_);
+                    if (wake_.wait_until(lock, stop, due, [] { return false; }) ||
+                        stop.stop_requested()) {
+                        stopped = true;
+                        return false;
+                    }
+                }
+                if (!waitForRoom(stop)) {
+                    stopped = true;
+                    return false;
+                }
+                sink(event.stream, std::move(event.object));
+                ++thisPass;
+                const std::lock_guard lock(mutex_);
+                position_ = event.id;
+                ++played_;
+                return true;
+            });
+        } catch (const recordings::RecordingError& e) {
+            systemLog(format("replay %s; the replay stops here", e.what()));
+            const std::lock_guard lock(mutex_);
+            finished_ = true;
+            return;
+        }
+        if (stopped) return;
+
+        bool say = false;
+        std::uint64_t played = 0;
+        {
+            const std::lock_guard lock(mutex_);
+            say = !endSaid_;
+            endSaid_ = true;
+            played = played_;
+            if (!options_.loop || (thisPass == 0 && after == 0)) {
+                finished_ = true;
+            } else {
+                position_ = 0;
+            }
+        }
+        if (say) {
+            const auto count = static_cast<unsigned long long>(played);
+            if (!options_.loop) {
+                systemLog(
+                    format("replay %s: end of the recording after %llu events; the screens "
+                           "keep the last values",
+                           options_.file.c_str(), count));
+            } else {
+                systemLog(
+                    format("replay %s: end of the recording after %llu events; playing it "
+                           "again from the start (said once)",
+                           options_.file.c_str(), count));
+            }
+        }
+        if (finished()) {
+            if (options_.loop)
+                systemLog(
+                    format("replay %s: the recording holds no events", options_.file.c_str()));
+            if (say && options_.onEnd) options_.onEnd();
+            return;
+        }
+    }
+}
+
+}  // namespace pyx::replay

@@ -1,0 +1,156 @@
+import QtQuick
+import QtTest
+
+// The chart pages as a user meets them: the button that opens them, the words shown before
+// anything has arrived, one panel per unit over one time window, the window selector, and a
+// refresh that reads the history only when it has changed.
+TestCase {
+    id: testCase
+    name: "Chart"
+    width: 390
+    height: 844
+    visible: true
+    when: windowShown
+
+    property var view: null
+    // 2024-06-01 00:00:00 UTC.
+    readonly property real start: 1717200000000
+
+    SignalSpy {
+        id: changedSpy
+        signalName: "changed"
+    }
+
+    function init() {
+        testNavigator.popToRoot()
+        testNavigator.animated = false
+        testStore.clearHistory()
+        const component = Qt.createComponent("qrc:/pyxon/PyxonView.qml")
+        verify(component.status === Component.Ready, component.errorString())
+        view = createTemporaryObject(component, testCase,
+                                     { navigator: testNavigator, width: 390, height: 844 })
+        verify(view !== null)
+        view.forceActiveFocus()
+        waitForRendering(view)
+    }
+
+    function openChart(group, category) {
+        verify(testNavigator.open([group, category]))
+        const button = findChild(view, "chartButton")
+        verify(button.visible)
+        mouseClick(button)
+        compare(view.stack.depth, 4)
+        waitForRendering(view)
+        return view.stack.currentItem
+    }
+
+    function idle(rxlev, atMs) {
+        verify(testStore.record("myGSMIdleScellMeasDict", ["idle_rxlev_dBm", rxlev], atMs))
+    }
+
+    function test_onlyScreensOfMeasuredQuantitiesOfferAChart() {
+        verify(testNavigator.open(["LTE", "C-DRX"]))
+        verify(!findChild(view, "chartButton").visible)
+        verify(testNavigator.open(["LTE", "Serving Cell Meas"]))
+        verify(findChild(view, "chartButton").visible)
+        verify(testNavigator.open(["GSM"]))
+        verify(!findChild(view, "chartButton").visible)
+    }
+
+    function test_emptyHistorySaysSoInWords() {
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        compare(findChild(view, "titleLabel").text, "GSM serving")
+        const words = findChild(page, "emptyText")
+        verify(words.visible)
+        verify(words.text.indexOf("Nothing has arrived yet") === 0, words.text)
+        verify(!findChild(page, "panels").visible)
+        compare(page.chart.panelCount, 0)
+        verify(page.chart.empty)
+    }
+
+    function test_onePanelPerUnitOverOneTimeWindow() {
+        idle(-82, start)
+        idle(-80, start + 30000)
+        verify(testStore.record("myGSMConnRfMeasDict", ["cs_rxlev_sub", 29], start + 60000))
+        const page = openChart("GSM", "Connected Serv Cell Meas")
+        const chart = page.chart
+        verify(!chart.empty)
+        verify(!findChild(page, "emptyText").visible)
+        compare(chart.panelCount, 2)
+        compare(chart.unit(0), "dBm")
+        compare(chart.seriesNames(0), ["RxLev idle"])
+        compare(chart.unit(1), "RxLev")
+        compare(chart.seriesNames(1), ["RxLev connected"])
+        compare(chart.windowMinutes, 5)
+        compare(chart.toMs, start + 60000)
+        compare(chart.fromMs, start + 60000 - 5 * 60000)
+        compare(chart.segmentCount(0), 1)
+        compare(chart.segmentLine(0, 0), 0)
+        verify(chart.minimum(0) < -82 && chart.maximum(0) > -80)
+        compare(chart.missingText, "")
+        compare(chart.caption(0), "")
+        verify(findChild(page, "panel0") !== null)
+        verify(findChild(page, "panel1") !== null)
+    }
+
+    function test_quantitiesNeverReportedAreNamed() {
+        idle(-82, start)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        compare(page.chart.missingText, "RxLev connected")
+        const missing = findChild(page, "missingText")
+        verify(missing.visible)
+        compare(missing.text, "Not reported: RxLev connected")
+    }
+
+    function test_windowSelectorChoosesHowMuchIsShown() {
+        idle(-90, start)
+        idle(-70, start + 4 * 60000)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chart = page.chart
+        compare(chart.minimum(0) <= -90, true)
+        mouseClick(findChild(page, "window1"))
+        compare(chart.windowMinutes, 1)
+        // Only the newest point is within the last minute.
+        verify(chart.minimum(0) > -90, chart.minimum(0))
+        compare(chart.fromMs, start + 3 * 60000)
+        mouseClick(findChild(page, "window30"))
+        compare(chart.windowMinutes, 30)
+        chart.windowMinutes = 7   // not a choice: ignored
+        compare(chart.windowMinutes, 30)
+    }
+
+    function test_refreshReadsTheHistoryOnlyWhenItChanged() {
+        idle(-82, start)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        changedSpy.target = page.chart
+        changedSpy.clear()
+        page.chart.refresh()
+        compare(changedSpy.count, 0)
+        idle(-81, start + 2000)
+        page.chart.refresh()
+        compare(changedSpy.count, 1)
+        compare(page.chart.toMs, start + 2000)
+    }
+
+    function test_updatesWhileShownAndStopsWhenClosed() {
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const timer = findChild(page, "chartTimer")
+        verify(timer.running)
+        compare(timer.interval, 1000)
+        verify(page.chart.empty)
+        idle(-75, start)
+        tryVerify(() => !page.chart.empty, 3000)
+        verify(findChild(page, "panels").visible)
+        testNavigator.back()
+        compare(view.stack.depth, 3)
+        verify(!timer.running)
+    }
+
+    function test_backFromTheChartReturnsToItsScreen() {
+        openChart("LTE", "Tx Power")
+        compare(findChild(view, "titleLabel").text, "LTE serving")
+        keyClick(Qt.Key_Escape)
+        compare(view.stack.depth, 3)
+        compare(findChild(view, "titleLabel").text, "Tx Power")
+    }
+}

@@ -1,0 +1,373 @@
+#include "tools/ExportCommand.h"
+
+#include <CLI/CLI.hpp>
+
+#include <charconv>
+#include <iostream>
+#include <memory>
+#include <unordered_map>
+
+#include "baseband/EventRecord.h"
+#include "baseband/velk/Names.h"
+#include "core/Format.h"
+#include "core/Log.h"
+#include "core/ValueJson.h"
+#include "metrics/MetricValidator.h"
+#include "recordings/RecordingError.h"
+#include "recordings/RecordingReader.h"
+#include "tools/CsvText.h"
+#include "tools/DecodeCommand.h"
+#include "tools/IsoTime.h"
+
+namespace pyx {
+namespace {
+
+using recordings::RecordedEvent;
+using recordings::RecordingError;
+using recordings::RecordingReader;
+
+constexpr std::size_t kChunk = 1 << 16;
+
+bool isPlainKey(std::string_view key) {
+    for (const char c : key) {
+        const bool plain = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') ||
+                           (c >= '0' && c <= '9') || c == '_' || c == '.' || c == '-';
+        if (!plain) return false;
+    }
+    return true;
+}
+
+void appendJsonText(std::string& out, const Value& value) {
+    out += toJson(value).dump(-1, ' ', false, nlohmann::json::error_handler_t::replace);
+}
+
+void appendKey(std::string& out, std::string_view key) {
+    if (isPlainKey(key)) {
+        out += '"';
+        out += key;
+        out += '"';
+    } else {
+        appendJsonText(out, Value(key));
+    }
+}
+
+void appendInteger(std::string& out, auto value) {
+    char digits[24];
+    const auto [end, error] = std::to_chars(digits, digits + sizeof digits, value);
+    static_cast<void>(error);
+    out.append(digits, end);
+}
+
+void appendValue(std::string& out, const Value& value) {
+    static constexpr char kHex[] = "0123456789abcdef";
+    switch (value.kind()) {
+        case Value::Kind::Int:
+            appendInteger(out, value.asInt());
+            return;
+        case Value::Kind::UInt:
+            appendInteger(out, value.asUInt());
+            return;
+        case Value::Kind::Data: {
+            const Bytes& bytes = value.asBytes();
+            const std::size_t at = out.size();
+            out.resize(at + 2 + bytes.size() * 2);
+            char* p = out.data() + at;
+            *p++ = '"';
+            for (const std::uint8_t b : bytes) {
+                *p++ = kHex[b >> 4];
+                *p++ = kHex[b & 15];
+            }
+            *p = '"';
+            return;
+        }
+        default:
+            appendJsonText(out, value);
+            return;
+    }
+}
+
+void appendEntry(std::string& out, std::string_view key, const Value& value) {
+    out += ", ";
+    appendKey(out, key);
+    out += ": ";
+    appendValue(out, value);
+}
+
+std::string metricText(std::optional<std::int64_t> metricID) {
+    return metricID ? format("0x%llX", static_cast<unsigned long long>(*metricID))
+                    : std::string("(no metric ID)");
+}
+
+std::optional<std::int64_t> metricIDFromHex(std::string_view text) {
+    if (text.starts_with("0x") || text.starts_with("0X")) text.remove_prefix(2);
+    std::int64_t value = 0;
+    const auto* end = text.data() + text.size();
+    const auto [at, error] = std::from_chars(text.data(), end, value, 16);
+    if (text.empty() || error != std::errc{} || at != end) return std::nullopt;
+    return value;
+}
+
+// The store's standard-output lines are not wanted while exporting.
+class QuietStore {
+  public:
+    QuietStore() {
+        standardOutputSink().intercept([](std::string_view) {});
+    }
+    ~QuietStore() { standardOutputSink().intercept({}); }
+    QuietStore(const QuietStore&) = delete;
+    QuietStore& operator=(const QuietStore&) = delete;
+};
+
+// One text per scalar field of a dictionary, named by its path.
+void flatten(const Value& value, std::string& path,
+             const std::function<void(const std::string&, const Value&)>& scalar) {
+    const std::size_t mark = path.size();
+    if (value.isDict()) {
+        for (const auto& entry : value.asDict()) {
+            if (mark > 0) path += '.';
+            path += entry.key;
+            flatten(entry.value, path, scalar);
+            path.resize(mark);
+        }
+    } else if (value.isArray()) {
+        const Array& items = value.asArray();
+        for (std::size_t i = 0; i < items.size(); ++i) {
+            if (mark > 0) path += '.';
+            path += std::to_string(i);
+            flatten(items[i], path, scalar);
+            path.resize(mark);
+        }
+    } else {
+        scalar(path, value);
+    }
+}
+
+std::string cellText(const Value& value) {
+    switch (value.kind()) {
+        case Value::Kind::Null:
+            return {};
+        case Value::Kind::Bool:
+            return value.asBool() ? "true" : "false";
+        case Value::Kind::Int:
+            return std::to_string(value.asInt());
+        case Value::Kind::UInt:
+            return std::to_string(value.asUInt());
+        case Value::Kind::Float:
+            return formatFloat(value.asFloat());
+        case Value::Kind::String:
+            return value.asString();
+        case Value::Kind::Data:
+            return hexString(value.asBytes());
+        default:
+            return value.description();
+    }
+}
+
+MetricRecord recordOf(const RecordedEvent& event) {
+    return metricRecordFromEvent(event.object);
+}
+
+void damagedLine(std::ostream& err, const RecordingError& e, std::uint64_t exported) {
+    err << "pyxonctl export: " << e.what() << "; exported the " << exported
+        << " events read before it\n";
+}
+
+int exportJsonl(const RecordingReader& reader, const RecordingReader::Filter& filter,
+                std::ostream& out, std::ostream& err) {
+    std::string buffer;
+    buffer.reserve(kChunk + 4096);
+    std::uint64_t exported = 0;
+    int status = 0;
+    try {
+        reader.forEach(filter, [&](RecordedEvent& event) {
+            appendExportLine(buffer, event);
+            buffer += '\n';
+            ++exported;
+            if (buffer.size() >= kChunk) {
+                out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
+                buffer.clear();
+            }
+            return out.good();
+        });
+    } catch (const RecordingError& e) {
+        damagedLine(err, e, exported);
+        status = 1;
+    }
+    out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
+    out.flush();
+    return status;
+}
+
+int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filter,
+              std::ostream& out, std::ostream& err) {
+    const QuietStore quiet;
+    // First pass: the columns, in the order first seen.
+    std::vector<std::string> columns{"time", "metric", "property"};
+    std::unordered_map<std::string, std::size_t> columnIndex;
+    for (std::size_t i = 0; i < columns.size(); ++i) columnIndex.emplace(columns[i], i);
+    std::string path;
+    {
+        const auto store = MetricValidator::create(nullptr);
+        try {
+            reader.forEach(filter, [&](RecordedEvent& event) {
+                const DecodeOutcome outcome = decodeRecord(*store, recordOf(event));
+                if (outcome.dictionary == nullptr) return true;
+                path.clear();
+                flatten(Value(*outcome.dictionary), path,
+                        [&](const std::string& name, const Value&) {
+                            if (columnIndex.emplace(name, columns.size()).second)
+                                columns.push_back(name);
+                        });
+                return true;
+            });
+        } catch (const RecordingError&) {
+            // The second pass stops at the same place and says so.
+        }
+    }
+
+    // Second pass: the rows.
+    std::string buffer;
+    appendCsvRow(buffer, columns);
+    std::vector<std::string> cells(columns.size());
+    std::uint64_t exported = 0;
+    std::uint64_t refused = 0;
+    int status = 0;
+    const auto store = MetricValidator::create(nullptr);
+    try {
+        reader.forEach(filter, [&](RecordedEvent& event) {
+            ++exported;
+            const DecodeOutcome outcome = decodeRecord(*store, recordOf(event));
+            if (outcome.error) {
+                ++refused;
+                err << "pyxonctl export: event " << event.id
+                    << " skipped: " << metricText(outcome.metricID) << ": " << *outcome.error
+                    << '\n';
+                return true;
+            }
+            if (outcome.dictionary == nullptr) return true;
+            for (auto& cell : cells) cell.clear();
+            cells[0] = isoTime(event.wallNs);
+            cells[1] = metricText(outcome.metricID);
+            cells[2] = outcome.property;
+            path.clear();
+            flatten(Value(*outcome.dictionary), path, [&](const std::string& name, const Value& v) {
+                const auto at = columnIndex.find(name);
+                if (at != columnIndex.end()) cells[at->second] = cellText(v);
+            });
+            appendCsvRow(buffer, cells);
+            if (buffer.size() >= kChunk) {
+                out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
+                buffer.clear();
+            }
+            return out.good();
+        });
+    } catch (const RecordingError& e) {
+        damagedLine(err, e, exported);
+        status = 1;
+    }
+    out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
+    out.flush();
+    if (refused > 0)
+        err << "pyxonctl export: " << refused << " of " << exported
+            << " records were refused by the store and skipped\n";
+    return status;
+}
+
+}  // namespace
+
+void appendExportLine(std::string& out, const RecordedEvent& event) {
+    out += "{\"time\": \"";
+    appendIsoTime(out, event.wallNs);
+    out += '"';
+    if (!event.object.isDict()) {
+        out += '}';
+        return;
+    }
+    // As pyxonctl listen prints a record: the metric ID, the payload, then the other keys.
+    const Dict& record = event.object.asDict();
+    const Value* metricID = record.find(velk::kKeyMetricID);
+    const Value* payload = record.find(velk::kKeyPayload);
+    if (metricID) appendEntry(out, velk::kKeyMetricID, *metricID);
+    if (payload) appendEntry(out, velk::kKeyPayload, *payload);
+    for (const auto& entry : record) {
+        if (&entry.value != metricID && &entry.value != payload)
+            appendEntry(out, entry.key, entry.value);
+    }
+    out += '}';
+}
+
+int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err) {
+    RecordingReader::Filter filter;
+    filter.stream = velk::kEventMetric;
+    for (const auto& kind : request.kinds) {
+        const auto metricID = metricIDFromHex(kind);
+        if (!metricID) {
+            err << "pyxonctl export: --kind '" << kind
+                << "' is not a metric ID in hex; example: --kind 0x3C4E04\n";
+            return 2;
+        }
+        filter.metricIDs.push_back(*metricID);
+    }
+    const auto time = [&](const std::optional<std::string>& text, const char* option,
+                          std::optional<std::int64_t>& into) {
+        if (!text) return true;
+        into = parseIsoTime(*text);
+        if (!into)
+            err << "pyxonctl export: " << option << " '" << *text
+                << "' is not a time; example: 2026-11-23T19:05:50Z (UTC without a zone)\n";
+        return into.has_value();
+    };
+    if (!time(request.from, "--from", filter.fromNs) || !time(request.to, "--to", filter.toNs))
+        return 2;
+    if (request.format != "jsonl" && request.format != "csv") {
+        err << "pyxonctl export: --format '" << request.format << "': expected jsonl or csv\n";
+        return 2;
+    }
+    std::optional<RecordingReader> reader;
+    try {
+        reader.emplace(request.file);
+    } catch (const RecordingError& e) {
+        err << "pyxonctl export: " << e.what() << '\n';
+        return 1;
+    }
+    return request.format == "csv" ? exportCsv(*reader, filter, out, err)
+                                   : exportJsonl(*reader, filter, out, err);
+}
+
+Subcommand addExportCommand(CLI::App& pyxonctl) {
+    CLI::App* command = pyxonctl.add_subcommand(
+        "export", "Write the metric events of a recording (.pyxrec) as JSON Lines or CSV");
+    auto request = std::make_shared<ExportRequest>();
+    command->add_option("FILE", request->file, "The recording, made with --record")->required();
+    command->add_option("--format", request->format, "jsonl or csv")
+        ->check(CLI::IsMember({"jsonl", "csv"}))
+        ->capture_default_str();
+    command
+        ->add_option("--kind", request->kinds,
+                     "Only this metric ID, in hex (may be given more than once)")
+        ->type_name("HEX");
+    command->add_option("--from", request->from, "Only events that arrived at or after TIME")
+        ->type_name("TIME");
+    command->add_option("--to", request->to, "Only events that arrived at or before TIME")
+        ->type_name("TIME");
+    command->footer(
+        "jsonl: one line per metric event, in order, as pyxonctl listen prints it with the time\n"
+        "of arrival first:\n"
+        "  {\"time\": \"2026-11-23T19:05:50.123456789Z\", \"kKeyMetricID\": 3952132, "
+        "\"kKeyPayload\": \"0a08...\"}\n"
+        "csv: one row per event the store decodes: time, metric, property and one column per\n"
+        "field of the decoded dictionary (inst_values.0.rsrp0 ...); the header holds every "
+        "column\nof the kinds asked for. Records the store refuses are skipped, one stderr line "
+        "each.\n"
+        "TIME is ISO 8601, UTC unless it names a zone: 2026-11-23T19:05:50Z, 2026-11-23 "
+        "19:05,\n2026-11-23T21:05:50.5+02:00. A damaged recording exports what can be read and "
+        "says\nhow much that was (exit code 1).\n"
+        "Examples:\n"
+        "  pyxonctl export drive.pyxrec --format jsonl | pyxonctl screen LTE \"CA Status\"\n"
+        "  pyxonctl export drive.pyxrec --format csv --kind 0x3C4E04 > rrc-state.csv\n"
+        "  pyxonctl export drive.pyxrec --format csv --from 2026-11-23T19:05Z --to "
+        "2026-11-23T19:10Z\n");
+    return Subcommand{command, [request] { return runExport(*request, std::cout, std::cerr); }};
+}
+
+}  // namespace pyx

@@ -1,0 +1,21 @@
+// Times of recordings as text: ISO 8601 in UTC with nanoseconds, "2026-11-23T19:05:50.123456789Z",
+// the form info and export write, and the forms --from and --to read.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace pyx {
+
+// Appends ns (since 1970, UTC) as "YYYY-MM-DDTHH:MM:SS.nnnnnnnnnZ".
+void appendIsoTime(std::string& out, std::int64_t ns);
+[[nodiscard]] std::string isoTime(std::int64_t ns);
+
+// "YYYY-MM-DD", "YYYY-MM-DDTHH:MM", "YYYY-MM-DDTHH:MM:SS" with an optional fraction of up to
+// nine digits, a blank instead of the T, and "Z", "+HH:MM" or "-HH:MM" at the end (no zone:
+// UTC). Nothing for anything else.
+[[nodiscard]] std::optional<std::int64_t> parseIsoTime(std::string_view text);
+
+}  // namespace pyx

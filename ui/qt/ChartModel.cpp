@@ -1,0 +1,196 @@
+#include "ui/qt/ChartModel.h"
+
+#include <QXYSeries>
+
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
+namespace pyx::qt {
+namespace {
+
+// A line breaks where its points stop for longer than this and than kGapSpacings times
+// its mean spacing in the window (so that a quantity reported seldom still draws a line).
+constexpr double kGapMs = 10'000;
+constexpr double kGapSpacings = 5;
+
+}  // namespace
+
+ChartModel::ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent)
+    : QObject(parent), history_(std::move(history)), chart_(chart) {
+    rebuild();
+}
+
+QString ChartModel::title() const {
+    return QString::fromUtf8(chartTitle(chart_));
+}
+
+void ChartModel::setWindowMinutes(int minutes) {
+    if (minutes == windowMinutes_ || !windowChoices().contains(minutes)) return;
+    windowMinutes_ = minutes;
+    emit windowMinutesChanged();
+    rebuild();
+    emit changed();
+}
+
+QString ChartModel::emptyText() const {
+    if (!empty()) return {};
+    if (!history_->newestMs())
+        return QStringLiteral(
+            "Nothing has arrived yet. The chart starts with the first "
+            "measurement.");
+    return QStringLiteral(
+               "No %1 measurement in the last %2 min. The source has not reported "
+               "any of: %3.")
+        .arg(title(), QString::number(windowMinutes_), missingText_);
+}
+
+const ChartModel::Panel* ChartModel::panelAt(int panel) const {
+    if (panel < 0 || panel >= panelCount()) return nullptr;
+    return &panels_[static_cast<std::size_t>(panel)];
+}
+
+QString ChartModel::unit(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? QString::fromUtf8(unitText(p->unit)) : QString();
+}
+
+QStringList ChartModel::seriesNames(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->names : QStringList();
+}
+
+QString ChartModel::caption(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->caption : QString();
+}
+
+double ChartModel::minimum(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->minimum : 0;
+}
+
+double ChartModel::maximum(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? p->maximum : 0;
+}
+
+int ChartModel::segmentCount(int panel) const {
+    const Panel* p = panelAt(panel);
+    return p ? static_cast<int>(p->segments.size()) : 0;
+}
+
+int ChartModel::segmentLine(int panel, int segment) const {
+    const Panel* p = panelAt(panel);
+    if (p == nullptr || segment < 0 || segment >= static_cast<int>(p->segments.size())) return -1;
+    return p->segmentLines[static_cast<std::size_t>(segment)];
+}
+
+QList<QPointF> ChartModel::points(int panel, int segment) const {
+    const Panel* p = panelAt(panel);
+    if (p == nullptr || segment < 0 || segment >= static_cast<int>(p->segments.size())) return {};
+    return p->segments[static_cast<std::size_t>(segment)];
+}
+
+void ChartModel::fill(int panel, int index, QObject* series) const {
+    if (auto* const line = qobject_cast<QXYSeries*>(series)) line->replace(points(panel, index));
+}
+
+void ChartModel::refresh() {
+    if (read_ && history_->revision() == readRevision_ && history_->session() == readSession_)
+        return;
+    rebuild();
+    emit changed();
+}
+
+void ChartModel::rebuild() {
+    read_ = true;
+    readRevision_ = history_->revision();
+    readSession_ = history_->session();
+    panels_.clear();
+    toMs_ = history_->newestMs().value_or(0);
+    fromMs_ = toMs_ - windowMinutes_ * 60'000.0;
+
+    const auto series = history_->seriesOf(chart_, fromMs_);
+    // Panels in the order their units first occur among the chart's quantities.
+    const auto quantities = historyQuantities();
+    std::vector<bool> present(quantities.size(), false);
+    for (const Series* s : series) present[s->key().quantity] = true;
+    QStringList missing;
+    for (std::size_t i = 0; i < quantities.size(); ++i) {
+        const Quantity& q = quantities[i];
+        if (q.chart != chart_) continue;
+        if (!present[i]) {
+            const QString name = QString::fromUtf8(q.name);
+            if (!missing.contains(name)) missing << name;
+            continue;
+        }
+        const bool known = std::any_of(panels_.begin(), panels_.end(),
+                                       [&](const Panel& p) { return p.unit == q.unit; });
+        if (!known) {
+            const bool pairs = q.pick == Pick::Strongest && !q.keyB.empty();
+            panels_.push_back(Panel{
+                q.unit,
+                {},
+                pairs ? QString::fromUtf8(q.labelA) + '/' + QString::fromUtf8(q.labelB) : QString(),
+                {},
+                {},
+                0,
+                0});
+        }
+    }
+    missingText_ = missing.join(QStringLiteral(", "));
+
+    for (Panel& panel : panels_) {
+        double low = INFINITY;
+        double high = -INFINITY;
+        for (const Series* s : series) {
+            if (s->quantity().unit != panel.unit) continue;
+            const int lineIndex = static_cast<int>(panel.names.size());
+            panel.names << QString::fromStdString(s->label());
+            QList<QPointF> line;
+            const SeriesRing& ring = s->points();
+            std::size_t shown = 0;
+            double firstMs = 0;
+            for (std::size_t i = 0; i < ring.size(); ++i) {
+                if (ring.at(i).timeMs < fromMs_) continue;
+                if (shown++ == 0) firstMs = ring.at(i).timeMs;
+            }
+            const double spacing =
+                shown > 1 ? (ring.newest().timeMs - firstMs) / static_cast<double>(shown - 1) : 0;
+            const double gapMs = std::max(kGapMs, kGapSpacings * spacing);
+            double previousMs = -INFINITY;
+            for (std::size_t i = 0; i < ring.size(); ++i) {
+                const Bucket& b = ring.at(i);
+                if (b.timeMs < fromMs_) continue;
+                if (b.timeMs - previousMs > gapMs && !line.isEmpty()) {
+                    panel.segments.push_back(std::move(line));
+                    panel.segmentLines.push_back(lineIndex);
+                    line = QList<QPointF>();
+                }
+                previousMs = b.timeMs;
+                low = std::min(low, static_cast<double>(b.min));
+                high = std::max(high, static_cast<double>(b.max));
+                if (b.min == b.max) {
+                    line.append(QPointF(b.timeMs, b.min));
+                    continue;
+                }
+                // Both ends of the slot, the one that came last drawn last.
+                const bool endsHigh = b.last == b.max;
+                line.append(QPointF(b.timeMs, endsHigh ? b.min : b.max));
+                line.append(QPointF(b.timeMs + 1, endsHigh ? b.max : b.min));
+            }
+            if (!line.isEmpty()) {
+                panel.segments.push_back(std::move(line));
+                panel.segmentLines.push_back(lineIndex);
+            }
+        }
+        // Room above and below the lines, and at least a few units of range.
+        const double span = std::max(high - low, 4.0);
+        const double middle = (high + low) / 2;
+        panel.minimum = std::floor(middle - span * 0.6);
+        panel.maximum = std::ceil(middle + span * 0.6);
+    }
+}
+
+}  // namespace pyx::qt

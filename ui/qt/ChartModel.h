@@ -1,0 +1,107 @@
+// A chart page's contents for Qt Quick: the history of one chart over the chosen window, as
+// one panel per unit (dBm, dB) holding the lines of that unit, all over one time axis. The
+// page asks it to refresh (at most once a second while it is shown); a refresh reads the
+// history only when points were added or the window changed.
+#pragma once
+
+#include <QList>
+#include <QObject>
+#include <QPointF>
+#include <QString>
+#include <QStringList>
+
+#include <memory>
+#include <vector>
+
+#include "metrics/history/Chart.h"
+#include "metrics/history/History.h"
+#include "metrics/history/Quantity.h"
+
+class QAbstractSeries;
+
+namespace pyx::qt {
+
+class ChartModel : public QObject {
+    Q_OBJECT
+    Q_PROPERTY(QString title READ title CONSTANT)
+    Q_PROPERTY(
+        int windowMinutes READ windowMinutes WRITE setWindowMinutes NOTIFY windowMinutesChanged)
+    Q_PROPERTY(QList<int> windowChoices READ windowChoices CONSTANT)
+    Q_PROPERTY(bool empty READ empty NOTIFY changed)
+    Q_PROPERTY(QString emptyText READ emptyText NOTIFY changed)
+    Q_PROPERTY(QString missingText READ missingText NOTIFY changed)
+    Q_PROPERTY(int panelCount READ panelCount NOTIFY changed)
+    Q_PROPERTY(double fromMs READ fromMs NOTIFY changed)
+    Q_PROPERTY(double toMs READ toMs NOTIFY changed)
+
+  public:
+    ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent = nullptr);
+
+    [[nodiscard]] QString title() const;
+    // The time shown, up to the newest point: 1, 5, 15 or 30 minutes (5 at first).
+    [[nodiscard]] int windowMinutes() const { return windowMinutes_; }
+    void setWindowMinutes(int minutes);
+    [[nodiscard]] static QList<int> windowChoices() { return {1, 5, 15, 30}; }
+
+    // No point of the chart within the window.
+    [[nodiscard]] bool empty() const { return panels_.empty(); }
+    // What the page says instead of drawing empty axes.
+    [[nodiscard]] QString emptyText() const;
+    // The quantities of the chart without a point in the window ("No data: RSRQ avg, SINR").
+    [[nodiscard]] QString missingText() const { return missingText_; }
+    [[nodiscard]] int panelCount() const { return static_cast<int>(panels_.size()); }
+    [[nodiscard]] double fromMs() const { return fromMs_; }
+    [[nodiscard]] double toMs() const { return toMs_; }
+
+    // The panel's unit ("dBm"), its lines' names, and the value range drawn.
+    Q_INVOKABLE QString unit(int panel) const;
+    Q_INVOKABLE QStringList seriesNames(int panel) const;
+    // What the names of a panel of neighbours are made of ("EARFCN/PCI"); empty otherwise.
+    Q_INVOKABLE QString caption(int panel) const;
+    Q_INVOKABLE double minimum(int panel) const;
+    Q_INVOKABLE double maximum(int panel) const;
+    // A line is drawn as one or more segments: it breaks where its points stop for a while
+    // (a neighbour that was not among the strongest, a kind that paused).
+    Q_INVOKABLE int segmentCount(int panel) const;
+    // The line (index into seriesNames) that segment belongs to.
+    Q_INVOKABLE int segmentLine(int panel, int segment) const;
+    // The points of a segment: x in ms since 1970, each slot as its minimum and maximum in
+    // the order they came.
+    [[nodiscard]] QList<QPointF> points(int panel, int segment) const;
+    // Puts those points into a line series of the chart view (replacing its points).
+    Q_INVOKABLE void fill(int panel, int segment, QObject* series) const;
+
+    // Reads the history again if points were added or the window changed; emits changed
+    // when it did.
+    Q_INVOKABLE void refresh();
+
+  signals:
+    void changed();
+    void windowMinutesChanged();
+
+  private:
+    struct Panel {
+        Unit unit = Unit::Dbm;
+        QStringList names;
+        QString caption;
+        std::vector<QList<QPointF>> segments;
+        std::vector<int> segmentLines;
+        double minimum = 0;
+        double maximum = 0;
+    };
+    [[nodiscard]] const Panel* panelAt(int panel) const;
+    void rebuild();
+
+    std::shared_ptr<const History> history_;
+    Chart chart_;
+    int windowMinutes_ = 5;
+    std::vector<Panel> panels_;
+    QString missingText_;
+    double fromMs_ = 0;
+    double toMs_ = 0;
+    bool read_ = false;
+    std::uint64_t readRevision_ = 0;
+    std::uint32_t readSession_ = 0;
+};
+
+}  // namespace pyx::qt
