@@ -20,6 +20,8 @@ StopOnSignal::StopOnSignal(MainQueue& queue) {
 
 StopOnSignal::~StopOnSignal() {
     done_ = true;
+    // Wakes the waiter's sigwait (the signal is blocked in every thread); it ends nothing.
+    // NOLINTNEXTLINE(bugprone-bad-signal-to-kill-thread)
     pthread_kill(waiter_.native_handle(), SIGTERM);
     waiter_.join();
 }

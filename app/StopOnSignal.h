@@ -3,7 +3,7 @@
 // the queue then runs what was queued by then and its run() returns.
 #pragma once
 
-#include <signal.h>
+#include <signal.h>  // NOLINT(modernize-deprecated-headers): POSIX sigset_t and sigwait
 
 #include <atomic>
 #include <thread>

@@ -154,7 +154,7 @@ std::uint64_t RecordingReader::forEach(
     } catch (const RecordCodecError& e) {
         throw RecordingError(
             RecordingError::Kind::Damaged, path_,
-            format("damaged at event %lld (%s)", static_cast<long long>(lastID + 1), e.what()),
+            format("damaged at event %lld (%s)", static_cast<long long>(lastID) + 1, e.what()),
             handed);
     }
     return handed;

@@ -77,7 +77,7 @@ std::string whyWriteFailed(const SqliteError& error, const std::string& path) {
                                    : std::filesystem::path(path).parent_path().string();
     struct statvfs space {};
     if (::statvfs(folder.c_str(), &space) == 0 &&
-        static_cast<std::uintmax_t>(space.f_bavail) * space.f_frsize < 1024 * 1024)
+        static_cast<std::uintmax_t>(space.f_bavail) * space.f_frsize < std::uintmax_t{1024} * 1024)
         return "the disk is full";
     if (error.systemErrno() == EROFS || error.systemErrno() == EACCES)
         return "the file or its folder is read-only";

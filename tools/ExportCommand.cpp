@@ -276,7 +276,7 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
 }  // namespace
 
 void appendExportLine(std::string& out, const RecordedEvent& event) {
-    out += "{\"time\": \"";
+    out += R"({"time": ")";
     appendIsoTime(out, event.wallNs);
     out += '"';
     if (!event.object.isDict()) {

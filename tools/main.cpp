@@ -1,4 +1,5 @@
 // pyxonctl: command-line tools around the metric store.
+#include <string>
 #include <vector>
 
 #include "tools/DecodeCommand.h"
@@ -9,7 +10,8 @@
 #include "tools/ScreenCommand.h"
 #endif
 
-int main(int argc, char** argv) {
+// An exception that no subcommand expects ends the program through std::terminate, which names it.
+int main(int argc, char** argv) {  // NOLINT(bugprone-exception-escape)
     CLI::App pyxonctl{
         "pyxonctl: tools around Pyxon's metric store.\n"
         "Example: echo '{\"kKeyMetricID\": 3986178, \"kKeyPayload\": "
@@ -18,6 +20,7 @@ int main(int argc, char** argv) {
         "  pyxonctl info drive.pyxrec; pyxonctl export drive.pyxrec --format csv > drive.csv",
         "pyxonctl"};
     pyxonctl.require_subcommand(1);
+    pyxonctl.set_version_flag("--version", std::string("pyxonctl ") + PYXON_VERSION);
     std::vector<pyx::Subcommand> subcommands{
         pyx::addDecodeCommand(pyxonctl), pyx::addListenCommand(pyxonctl),
         pyx::addInfoCommand(pyxonctl), pyx::addExportCommand(pyxonctl)};

@@ -50,8 +50,8 @@ Bytes encodeIccid(std::string_view digits) {
 char luhnCheckDigit(std::string_view digits) {
     int sum = 0;
     bool doubleIt = true;  // the rightmost digit of the payload is doubled
-    for (auto it = digits.rbegin(); it != digits.rend(); ++it) {
-        int d = *it - '0';
+    for (std::size_t i = digits.size(); i-- > 0;) {
+        int d = digits[i] - '0';
         if (doubleIt) {
             d *= 2;
             if (d > 9) d -= 9;

@@ -95,8 +95,8 @@ TEST(ListenCommand, StopsAfterItsDurationWithZero) {
 }
 
 TEST(ListenCommand, ReaderThatGoesAwayEndsTheRunWithZero) {
-    const ProgramRun run =
-        shell("{ { \"$PYXONCTL\" listen --speed 50; echo $? >&3; } | head -n 2 > /dev/null; } 3>&1");
+    const ProgramRun run = shell(
+        "{ { \"$PYXONCTL\" listen --speed 50; echo $? >&3; } | head -n 2 > /dev/null; } 3>&1");
     EXPECT_EQ(run.out, "0\n");
 }
 

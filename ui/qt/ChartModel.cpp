@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <limits>
 #include <utility>
 
 namespace pyx::qt {
@@ -142,8 +143,8 @@ void ChartModel::rebuild() {
     missingText_ = missing.join(QStringLiteral(", "));
 
     for (Panel& panel : panels_) {
-        double low = INFINITY;
-        double high = -INFINITY;
+        double low = std::numeric_limits<double>::infinity();
+        double high = -std::numeric_limits<double>::infinity();
         for (const Series* s : series) {
             if (s->quantity().unit != panel.unit) continue;
             const int lineIndex = static_cast<int>(panel.names.size());
@@ -159,7 +160,7 @@ void ChartModel::rebuild() {
             const double spacing =
                 shown > 1 ? (ring.newest().timeMs - firstMs) / static_cast<double>(shown - 1) : 0;
             const double gapMs = std::max(kGapMs, kGapSpacings * spacing);
-            double previousMs = -INFINITY;
+            double previousMs = -std::numeric_limits<double>::infinity();
             for (std::size_t i = 0; i < ring.size(); ++i) {
                 const Bucket& b = ring.at(i);
                 if (b.timeMs < fromMs_) continue;

@@ -3,8 +3,6 @@
 #include <QImage>
 #include <QTimer>
 
-#include <utility>
-
 #include "core/Log.h"
 #include "ui/ChartScreens.h"
 #include "ui/PyxViewItems.h"
@@ -25,12 +23,12 @@ QString slug(const QString& title) {
 
 }  // namespace
 
-Screenshots::Screenshots(Navigator& navigator, QQuickWindow& window, QDir folder, int chartDelayMs,
-                         QObject* parent)
+Screenshots::Screenshots(Navigator& navigator, QQuickWindow& window, const QDir& folder,
+                         int chartDelayMs, QObject* parent)
     : QObject(parent),
       navigator_(navigator),
       window_(window),
-      folder_(std::move(folder)),
+      folder_(folder),
       paths_(paths()),
       chartDelayMs_(chartDelayMs),
       charts_(chartNumbers()) {}

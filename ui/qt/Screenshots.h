@@ -23,8 +23,8 @@ class Screenshots : public QObject {
     // ..., "06-device-info-imsi.png", ...
     // chartDelayMs: the pause before the chart pages, taken only when the navigator offers
     // charts.
-    Screenshots(Navigator& navigator, QQuickWindow& window, QDir folder, int chartDelayMs = 5000,
-                QObject* parent = nullptr);
+    Screenshots(Navigator& navigator, QQuickWindow& window, const QDir& folder,
+                int chartDelayMs = 5000, QObject* parent = nullptr);
 
     // Takes the shots one by one from the event loop; emits finished with 0, or with 1 after
     // printing why a shot could not be taken or saved.
