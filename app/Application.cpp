@@ -9,6 +9,7 @@
 #include <string>
 
 #include "app/AppDelegate.h"
+#include "app/ProgramSource.h"
 #include "app/RejectedRecords.h"
 #include "app/RootNavigationController.h"
 #include "app/StopOnSignal.h"
@@ -156,23 +157,15 @@ int runPyxon(int argc, char** argv) {
     std::shared_ptr<velk::client::Transport> transport;
     std::shared_ptr<recordings::RecordingWriter> recording;
     try {
-        // A replay waits while the events it handed out are not yet taken in by the store.
         sources::SourceOptions sourceOptions;
         sourceOptions.spec = *sourceSpec;
         sourceOptions.seed = options.seed;
         sourceOptions.speed = options.speed;
         sourceOptions.loop = options.loop;
-        sourceOptions.backlog = [] {
-            return MainQueue::shared().pending() + VelkWrapper::queue().pending();
-        };
-        transport = sources::makeTransport(sourceOptions);
-        if (options.record) {
-            auto recorded = sources::recordSource(
-                std::move(transport), sourceOptions,
-                sources::RecordOptions{*options.record, options.append, PYXON_VERSION});
-            transport = std::move(recorded.transport);
-            recording = std::move(recorded.writer);
-        }
+        auto source = openProgramSource(std::move(sourceOptions), options.record, options.append,
+                                        PYXON_VERSION);
+        transport = std::move(source.transport);
+        recording = std::move(source.recording);
     } catch (const sources::SourceSpecError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;

@@ -10,6 +10,7 @@
 #include <thread>
 
 #include "app/Bundle.h"
+#include "app/ProgramSource.h"
 #include "app/RootNavigationController.h"
 #include "app/StopOnSignal.h"
 #include "baseband/VelkWrapper.h"
@@ -84,29 +85,21 @@ int runListen(const ListenOptions& options) {
     std::shared_ptr<velk::client::Transport> transport;
     std::shared_ptr<recordings::RecordingWriter> recording;
     try {
-        // A replay waits while the events it handed out are not yet taken in.
         sources::SourceOptions sourceOptions;
         sourceOptions.spec = *spec;
         sourceOptions.seed = options.seed;
         sourceOptions.speed = options.speed;
         sourceOptions.loop = options.loop;
-        sourceOptions.backlog = [] {
-            return MainQueue::shared().pending() + VelkWrapper::queue().pending();
-        };
         // A replay that ends ends the run, once the events before the end are printed: the
         // stop goes the way the events go, through the serial queue, then the main queue.
         sourceOptions.onEnd = [&mainQueue] {
             VelkWrapper::queue().post(
                 [&mainQueue] { mainQueue.post([&mainQueue] { mainQueue.stop(); }); });
         };
-        transport = sources::makeTransport(sourceOptions);
-        if (options.record) {
-            auto recorded = sources::recordSource(
-                std::move(transport), sourceOptions,
-                sources::RecordOptions{*options.record, options.append, PYXON_VERSION});
-            transport = std::move(recorded.transport);
-            recording = std::move(recorded.writer);
-        }
+        auto source = openProgramSource(std::move(sourceOptions), options.record, options.append,
+                                        PYXON_VERSION);
+        transport = std::move(source.transport);
+        recording = std::move(source.recording);
     } catch (const sources::SourceSpecError& e) {
         std::cerr << "pyxonctl listen: " << e.what() << "\n";
         return 2;
