@@ -146,26 +146,22 @@ std::optional<std::int64_t> registrationStatus(std::uint64_t state) {
     switch (state) {
         case 0:
             return kNoService;  // idle: not registered, not searching
-        case 1:
-            return kNormal;  // home
+        case 1:                 // home
+        case 5:                 // roaming
+        case 9:                 // home, CSFB not preferred
+        case 10:                // roaming, CSFB not preferred
+            return kNormal;
         case 2:
             return kInProgress;  // searching
         case 3:
             return kFailure;  // denied
         case 4:
             return std::nullopt;  // unknown
-        case 5:
-            return kNormal;  // roaming
-        case 6:
-            return kSmsOnly;  // home, SMS only
-        case 7:
-            return kSmsOnly;  // roaming, SMS only
+        case 6:                   // home, SMS only
+        case 7:                   // roaming, SMS only
+            return kSmsOnly;
         case 8:
             return kEmergency;  // emergency services only
-        case 9:
-            return kNormal;  // home, CSFB not preferred
-        case 10:
-            return kNormal;  // roaming, CSFB not preferred
         case 11:
             return kLimited;  // attached for RLOS
         default:
@@ -316,7 +312,8 @@ class RowReader {
     Value fromText(const std::string& text) {
         switch (row_.conversion) {
             case C::Same:
-                if (text.size() > row_.max) return leftOut("is longer than " + rangeText(row_));
+                if (static_cast<double>(text.size()) > row_.max)
+                    return leftOut("is longer than " + rangeText(row_));
                 return Value(text);
             case C::MccOfOperator:
             case C::MncOfOperator:
