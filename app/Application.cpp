@@ -66,7 +66,7 @@ int runPyxon(int argc, char** argv) {
                  "No window: print the system's lines as events arrive, until SIGINT or SIGTERM");
     cli.add_option("--source", options.source,
                    "Where events come from: sim, modem, modem:N or replay:FILE (see below)")
-        ->type_name("SPEC")
+        ->type_name("SOURCE")
         ->capture_default_str();
     cli.add_option("--seed", options.seed, "Seed of the simulated baseband's drive")
         ->capture_default_str();
@@ -110,10 +110,10 @@ int runPyxon(int argc, char** argv) {
         std::cerr << "pyxon: " << e.what() << "\nRun with --help for more information.\n";
         return 2;
     }
-    std::optional<sources::SourceSpec> sourceSpec;
+    std::optional<sources::SourceChoice> sourceChoice;
     try {
-        sourceSpec = sources::parseSourceSpec(options.source);
-    } catch (const sources::SourceSpecError& e) {
+        sourceChoice = sources::parseSource(options.source);
+    } catch (const sources::SourceError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;
     }
@@ -158,7 +158,7 @@ int runPyxon(int argc, char** argv) {
     std::shared_ptr<recordings::RecordingWriter> recording;
     try {
         sources::SourceOptions sourceOptions;
-        sourceOptions.spec = *sourceSpec;
+        sourceOptions.choice = *sourceChoice;
         sourceOptions.seed = options.seed;
         sourceOptions.speed = options.speed;
         sourceOptions.loop = options.loop;
@@ -166,7 +166,7 @@ int runPyxon(int argc, char** argv) {
                                         PYXON_VERSION);
         transport = std::move(source.transport);
         recording = std::move(source.recording);
-    } catch (const sources::SourceSpecError& e) {
+    } catch (const sources::SourceError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;
     }

@@ -19,7 +19,7 @@ struct ProgramSource {
 
 // options.backlog is set to what waits on the client's serial queue and the main queue, so
 // that a replay hands out no more than the store takes in. record: the recording's file, with
-// append for --append. Throws sources::SourceSpecError with one line saying what is wrong.
+// append for --append. Throws sources::SourceError with one line saying what is wrong.
 [[nodiscard]] ProgramSource openProgramSource(sources::SourceOptions options,
                                               const std::optional<std::string>& record, bool append,
                                               const std::string& programVersion);

@@ -17,13 +17,15 @@
 
 namespace pyx::sources {
 
-// A --source text that is not one of the forms below; what() says which forms there are.
-class SourceSpecError : public std::invalid_argument {
+// A source that cannot be had: a --source text not of the forms below, or options that do not
+// fit the source; what() is one line saying what is wrong.
+class SourceError : public std::invalid_argument {
   public:
     using std::invalid_argument::invalid_argument;
 };
 
-struct SourceSpec {
+// The source a --source text names.
+struct SourceChoice {
     enum class Kind { Sim, Modem, Replay };
     Kind kind = Kind::Sim;
     // modem:N, the modem whose object path ends in /Modem/N; absent for the first modem.
@@ -34,11 +36,11 @@ struct SourceSpec {
     std::string text = "sim";
 };
 
-// "sim", "modem", "modem:N" or "replay:FILE". Throws SourceSpecError.
-[[nodiscard]] SourceSpec parseSourceSpec(std::string_view text);
+// "sim", "modem", "modem:N" or "replay:FILE". Throws SourceError.
+[[nodiscard]] SourceChoice parseSource(std::string_view text);
 
 struct SourceOptions {
-    SourceSpec spec;
+    SourceChoice choice;
     std::uint64_t seed = 1;  // sim
     double speed = 1.0;      // sim: time runs this much faster; replay: 0 = as fast as taken
     bool loop = false;       // replay: start again at the end
@@ -49,7 +51,7 @@ struct SourceOptions {
     std::function<void()> onEnd;
 };
 
-// The transport of a source. Throws SourceSpecError for options that do not fit the source
+// The transport of a source. Throws SourceError for options that do not fit the source
 // (a speed the simulated baseband refuses, a replay file that cannot be opened...), with one
 // line that names what is wrong.
 [[nodiscard]] std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& options);
@@ -64,7 +66,7 @@ struct RecordOptions {
 // A transport that delivers what source delivers and writes every event to a recording as well
 // (started at once, on a thread of its own). The session notes options' source text, and its
 // seed and speed where they apply. The caller closes the writer before the process ends.
-// Throws SourceSpecError with one line naming the file (it exists and no append, it is a
+// Throws SourceError with one line naming the file (it exists and no append, it is a
 // directory, it is not a recording).
 struct RecordedSource {
     std::shared_ptr<velk::client::Transport> transport;

@@ -24,50 +24,50 @@ std::uint32_t modemIndex(std::string_view text, std::string_view whole) {
     const auto* end = text.data() + text.size();
     const auto [at, error] = std::from_chars(text.data(), end, index);
     if (text.empty() || error != std::errc{} || at != end)
-        throw SourceSpecError("--source " + std::string(whole) + ": '" + std::string(text) +
-                              "' is not a modem number; " + std::string(kForms));
+        throw SourceError("--source " + std::string(whole) + ": '" + std::string(text) +
+                          "' is not a modem number; " + std::string(kForms));
     return index;
 }
 
 }  // namespace
 
-SourceSpec parseSourceSpec(std::string_view text) {
-    SourceSpec spec;
-    spec.text = std::string(text);
-    if (text == "sim") return spec;
+SourceChoice parseSource(std::string_view text) {
+    SourceChoice choice;
+    choice.text = std::string(text);
+    if (text == "sim") return choice;
     if (text == "modem" || text.starts_with("modem:")) {
-        spec.kind = SourceSpec::Kind::Modem;
-        if (text != "modem") spec.modemIndex = modemIndex(text.substr(6), text);
-        return spec;
+        choice.kind = SourceChoice::Kind::Modem;
+        if (text != "modem") choice.modemIndex = modemIndex(text.substr(6), text);
+        return choice;
     }
     if (text.starts_with("replay:")) {
-        spec.kind = SourceSpec::Kind::Replay;
-        spec.file = std::string(text.substr(7));
-        if (spec.file.empty())
-            throw SourceSpecError("--source replay: names no file; example: replay:drive.pyxrec");
-        return spec;
+        choice.kind = SourceChoice::Kind::Replay;
+        choice.file = std::string(text.substr(7));
+        if (choice.file.empty())
+            throw SourceError("--source replay: names no file; example: replay:drive.pyxrec");
+        return choice;
     }
-    throw SourceSpecError("--source '" + std::string(text) + "': " + std::string(kForms));
+    throw SourceError("--source '" + std::string(text) + "': " + std::string(kForms));
 }
 
 std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& options) {
-    switch (options.spec.kind) {
-        case SourceSpec::Kind::Sim:
+    switch (options.choice.kind) {
+        case SourceChoice::Kind::Sim:
             try {
                 return std::make_shared<sim::SimulatedBaseband>(
                     sim::SimulatedBaseband::Options{options.seed, options.speed, std::nullopt});
             } catch (const std::invalid_argument& e) {
-                throw SourceSpecError(e.what());
+                throw SourceError(e.what());
             }
-        case SourceSpec::Kind::Modem: {
+        case SourceChoice::Kind::Modem: {
             modem::ModemManagerBaseband::Options modem;
-            modem.modemIndex = options.spec.modemIndex;
+            modem.modemIndex = options.choice.modemIndex;
             return std::make_shared<modem::ModemManagerBaseband>(modem);
         }
-        case SourceSpec::Kind::Replay:
+        case SourceChoice::Kind::Replay:
             try {
                 replay::ReplayTransport::Options replayOptions;
-                replayOptions.file = options.spec.file;
+                replayOptions.file = options.choice.file;
                 replayOptions.speed = options.speed;
                 replayOptions.loop = options.loop;
                 replayOptions.onEnd = options.onEnd;
@@ -76,12 +76,12 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
                 };
                 return std::make_shared<replay::ReplayTransport>(std::move(replayOptions));
             } catch (const recordings::RecordingError& e) {
-                throw SourceSpecError(std::string("--source replay: ") + e.what());
+                throw SourceError(std::string("--source replay: ") + e.what());
             } catch (const std::invalid_argument& e) {
-                throw SourceSpecError(e.what());
+                throw SourceError(e.what());
             }
     }
-    throw SourceSpecError("--source " + options.spec.text + ": unknown source");
+    throw SourceError("--source " + options.choice.text + ": unknown source");
 }
 
 RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
@@ -90,10 +90,10 @@ RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
     writer.path = record.file;
     writer.append = record.append;
     writer.session.programVersion = record.programVersion;
-    writer.session.source = options.spec.text;
-    if (options.spec.kind == SourceSpec::Kind::Sim)
+    writer.session.source = options.choice.text;
+    if (options.choice.kind == SourceChoice::Kind::Sim)
         writer.session.seed = static_cast<std::int64_t>(options.seed);
-    if (options.spec.kind != SourceSpec::Kind::Modem) writer.session.speed = options.speed;
+    if (options.choice.kind != SourceChoice::Kind::Modem) writer.session.speed = options.speed;
     char host[HOST_NAME_MAX + 1] = {};
     if (gethostname(host, sizeof host - 1) == 0) writer.session.host = host;
     try {
@@ -102,7 +102,7 @@ RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
             std::make_shared<recordings::RecordingTransport>(std::move(source), recording);
         return RecordedSource{std::move(transport), std::move(recording)};
     } catch (const recordings::RecordingError& e) {
-        throw SourceSpecError(std::string("--record ") + e.what());
+        throw SourceError(std::string("--record ") + e.what());
     }
 }
 

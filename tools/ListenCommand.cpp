@@ -67,10 +67,10 @@ class EventPrinter : public VelkWrapperDelegate {
 };
 
 int runListen(const ListenOptions& options) {
-    std::optional<sources::SourceSpec> spec;
+    std::optional<sources::SourceChoice> choice;
     try {
-        spec = sources::parseSourceSpec(options.source);
-    } catch (const sources::SourceSpecError& e) {
+        choice = sources::parseSource(options.source);
+    } catch (const sources::SourceError& e) {
         std::cerr << "pyxonctl listen: " << e.what() << "\n";
         return 2;
     }
@@ -86,7 +86,7 @@ int runListen(const ListenOptions& options) {
     std::shared_ptr<recordings::RecordingWriter> recording;
     try {
         sources::SourceOptions sourceOptions;
-        sourceOptions.spec = *spec;
+        sourceOptions.choice = *choice;
         sourceOptions.seed = options.seed;
         sourceOptions.speed = options.speed;
         sourceOptions.loop = options.loop;
@@ -100,7 +100,7 @@ int runListen(const ListenOptions& options) {
                                         PYXON_VERSION);
         transport = std::move(source.transport);
         recording = std::move(source.recording);
-    } catch (const sources::SourceSpecError& e) {
+    } catch (const sources::SourceError& e) {
         std::cerr << "pyxonctl listen: " << e.what() << "\n";
         return 2;
     }
@@ -141,7 +141,7 @@ Subcommand addListenCommand(CLI::App& pyxonctl) {
         "Start a source the way the viewer does and print every metric event as one JSON line "
         "({\"kKeyMetricID\": N, \"kKeyPayload\": \"hex\"}), the format decode and screen read");
     listen->add_option("--source", options->source, "sim, modem, modem:N or replay:FILE")
-        ->type_name("SPEC")
+        ->type_name("SOURCE")
         ->capture_default_str();
     listen->add_option("--seed", options->seed, "Seed of the simulated baseband's drive")
         ->capture_default_str();

@@ -362,13 +362,13 @@ TEST(Replay, ADamagedRecordingPlaysWhatCanBeReadThenSaysWhereItBrokeOff) {
     EXPECT_TRUE(lines[0].ends_with("; the replay stops here")) << lines[0];
 }
 
-std::string refusal(const std::string& spec, double speed = 1.0) {
+std::string refusal(const std::string& choice, double speed = 1.0) {
     pyx::sources::SourceOptions options;
-    options.spec = pyx::sources::parseSourceSpec(spec);
+    options.choice = pyx::sources::parseSource(choice);
     options.speed = speed;
     try {
         static_cast<void>(pyx::sources::makeTransport(options));
-    } catch (const pyx::sources::SourceSpecError& e) {
+    } catch (const pyx::sources::SourceError& e) {
         return e.what();
     }
     return "(accepted)";
