@@ -27,7 +27,13 @@ int main(int argc, char** argv) {  // NOLINT(bugprone-exception-escape)
 #ifdef PYXON_HAVE_SCREEN_COMMAND
     subcommands.push_back(pyx::addScreenCommand(pyxonctl));
 #endif
-    CLI11_PARSE(pyxonctl, argc, argv);
+    try {
+        pyxonctl.parse(argc, argv);
+    } catch (const CLI::ParseError& e) {
+        // Help and version end with 0; every usage error with 2, as pyxon's do.
+        const int status = pyxonctl.exit(e);
+        return status == 0 ? 0 : 2;
+    }
     for (const auto& subcommand : subcommands) {
         if (subcommand.parser->parsed()) return subcommand.run();
     }

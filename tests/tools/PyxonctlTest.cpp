@@ -110,4 +110,15 @@ TEST(Pyxonctl, MissingSubcommandIsAnError) {
     EXPECT_NE(run.exitCode, 0);
 }
 
+TEST(Pyxonctl, EveryUsageErrorExitsWithTwoAndNamesTheOption) {
+    const ProgramRun badValue = pyxonctl("export drive.pyxrec --format xml", "");
+    EXPECT_EQ(badValue.exitCode, 2);
+    EXPECT_NE(badValue.err.find("--format"), std::string::npos) << badValue.err;
+    const ProgramRun unknown = pyxonctl("decode --no-such-option", "");
+    EXPECT_EQ(unknown.exitCode, 2);
+    EXPECT_NE(unknown.err.find("--no-such-option"), std::string::npos) << unknown.err;
+    EXPECT_EQ(pyxonctl("", "").exitCode, 2);
+    EXPECT_EQ(pyxonctl("--version", "").exitCode, 0);
+}
+
 }  // namespace
