@@ -15,9 +15,24 @@ double systemClockMs() {
         .count();
 }
 
-std::optional<float> numberAt(const Dict& dict, std::string_view key) {
+// The number under key; with convertedAs, converted as that list converts the key.
+std::optional<float> numberAt(const Dict& dict, std::string_view key,
+                              const ListConversion* convertedAs = nullptr) {
     const Value* value = dict.find(key);
     if (value == nullptr || !value->isNumber() || value->isBool()) return std::nullopt;
+    std::optional<Value> converted;
+    if (convertedAs != nullptr) {
+        for (const KeyConversion& rule : convertedAs->keys) {
+            if (rule.key != key) continue;
+            try {
+                converted = convertValue(rule.conversion, *value, key);
+            } catch (const ConversionOverflow&) {
+                return std::nullopt;
+            }
+            break;
+        }
+        if (converted) value = &*converted;
+    }
     const auto number = value->toFloat();
     if (!number || !std::isfinite(*number)) return std::nullopt;
     return number;
@@ -96,7 +111,7 @@ void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
                 if (nested == nullptr || !nested->isDict()) return;
                 holder = &nested->asDict();
             }
-            if (const auto value = numberAt(*holder, q.field))
+            if (const auto value = numberAt(*holder, q.field, q.convertedAs))
                 singleFor(quantity).add(timeMs, *value);
             return;
         }

@@ -11,6 +11,13 @@ constexpr Quantity field(Chart chart, std::string_view name, Unit unit, P proper
                          std::string_view container, std::string_view key) {
     return {chart, name, unit, property, Pick::Field, container, key, {}, {}, {}, {}, {}};
 }
+// A field that the store keeps raw, converted as the screen's twin of it is.
+constexpr Quantity average(Chart chart, std::string_view name, Unit unit, P property,
+                           std::string_view container, std::string_view key,
+                           const ListConversion& convertedAs) {
+    return {chart, name, unit, property, Pick::Field, container,   key,
+            {},    {},   {},   {},       {},          &convertedAs};
+}
 constexpr Quantity first(Chart chart, std::string_view name, Unit unit, P property,
                          std::string_view list, std::string_view key) {
     return {chart, name, unit, property, Pick::FirstEntry, list, key, {}, {}, {}, {}, {}};
@@ -31,14 +38,18 @@ using C = Chart;
 using U = Unit;
 
 // The RSRP/RSRQ/SINR kind keeps its averages as they came and converts its instantaneous
-// values; the first antenna's values are charted. The WCDMA serving-cell measurement carries
+// values; the chart converts the averages the same way, so both lines share the screen's unit.
+// The first antenna's values are charted. The WCDMA serving-cell measurement carries
 // RSSI and SNR per receive chain (no RSCP or Ec/Io), so those are what its chart shows.
 constexpr std::array kQuantities = {
-    field(C::LteServing, "RSRP avg", U::Dbm, P::myLTERsrpRsrqSinrDict, "avg_values", "rsrp0"),
+    average(C::LteServing, "RSRP avg", U::Dbm, P::myLTERsrpRsrqSinrDict, "avg_values", "rsrp0",
+            listconversions::lteRsrpRsrqSinrInstValues),
     first(C::LteServing, "RSRP", U::Dbm, P::myLTERsrpRsrqSinrDict, "inst_values", "rsrp0"),
-    field(C::LteServing, "RSRQ avg", U::Db, P::myLTERsrpRsrqSinrDict, "avg_values", "rsrq0"),
+    average(C::LteServing, "RSRQ avg", U::Db, P::myLTERsrpRsrqSinrDict, "avg_values", "rsrq0",
+            listconversions::lteRsrpRsrqSinrInstValues),
     first(C::LteServing, "RSRQ", U::Db, P::myLTERsrpRsrqSinrDict, "inst_values", "rsrq0"),
-    field(C::LteServing, "SINR avg", U::Db, P::myLTERsrpRsrqSinrDict, "avg_values", "sinr0"),
+    average(C::LteServing, "SINR avg", U::Db, P::myLTERsrpRsrqSinrDict, "avg_values", "sinr0",
+            listconversions::lteRsrpRsrqSinrInstValues),
     first(C::LteServing, "SINR", U::Db, P::myLTERsrpRsrqSinrDict, "inst_values", "sinr0"),
     first(C::LteServing, "PUSCH Tx", U::Dbm, P::myLTETxPowerDict, "tx_power_info",
           "pusch_tx_power"),

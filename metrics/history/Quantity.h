@@ -6,6 +6,7 @@
 #include <span>
 #include <string_view>
 
+#include "metrics/ListConversions.h"
 #include "metrics/MetricValidator.h"
 #include "metrics/history/Chart.h"
 
@@ -48,6 +49,10 @@ struct Quantity {
     std::string_view keyB;
     std::string_view labelB;
     std::string_view rankField;  // Strongest: the higher, the stronger
+    // A value the store keeps raw whose twin the screens show converted (the averages of the
+    // RSRP/RSRQ/SINR kind): converted as this list converts the same key, so that the chart
+    // shows it in the screen's unit.
+    const ListConversion* convertedAs = nullptr;
 };
 
 // Every quantity, grouped by chart in chart order.

@@ -118,6 +118,19 @@ TEST(History, ServingQuantitiesComeFromTheStoredDictionary) {
     EXPECT_TRUE(history.seriesOf(Chart::LteCarriers, 0).empty());
 }
 
+TEST(History, AveragesAreChartedInTheUnitTheScreenShowsTheirInstantaneousTwinsIn) {
+    History history;
+    const Dict stored{{"avg_values", Value(entry({{"rsrp0", Value(std::int64_t{-97})},
+                                                  {"rsrq0", Value(std::int64_t{-14})},
+                                                  {"sinr0", Value(std::int64_t{27})}}))}};
+    history.record(P::myLTERsrpRsrqSinrDict, stored, kStart);
+    const auto series = history.seriesOf(Chart::LteServing, 0);
+    ASSERT_EQ(labels(series), (std::vector<std::string>{"RSRP avg", "RSRQ avg", "SINR avg"}));
+    EXPECT_EQ(series[0]->points().newest().last, -97.0F);  // kept raw on screen too
+    EXPECT_EQ(series[1]->points().newest().last, -14.0F);
+    EXPECT_EQ(series[2]->points().newest().last, 13.5F);  // half-dB steps, as sinr0 is shown
+}
+
 TEST(History, CarriersAreKeyedByTheirIndex) {
     History history;
     Array carriers;
