@@ -129,7 +129,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     modem::FieldIssues issues;
     const modem::ModemReading reading = modem::readModem(facts, issues);
     for (const modem::ModemKind& kind : modem::modemKinds())
-        if (const auto payload = kind.write(reading, 1500000000123ULL))
+        if (const auto payload = kind.write(reading, 1500000000123ULL, issues))
             expectDecodes(kind.metricID, *payload);
     expectDecodes(modem::kSimFilesMetricID, modem::simFilesPayload(reading, 1500000000123ULL));
     return 0;

@@ -24,13 +24,16 @@ using C = Conversion;
 
 // clang-format off
 constexpr std::array kRows = {
-    // source, key, D-Bus type, field, conversion, valid range (ModemManager's unit), our field
+    // source, key, D-Bus type, field, conversion, valid range (ModemManager's unit), our field.
+    // Every converted value of a range fits each field the row feeds: a power or quality index
+    // that some message holds unsigned starts where index 0 does, a weaker value being absurd
+    // for that field.
     ModemFieldRow{S::Modem, "AccessTechnologies", T::UInt32, F::ServingAccessTech, C::Same, 0, 4294967295.0, "serving technology (which serving-cell kinds)"},
     ModemFieldRow{S::SignalLte, "rsrp", T::Double, F::LteRsrp, C::Rounded, -156, -31, "LTE RsrpRsrqSinr.rsrp0 (dBm)"},
     ModemFieldRow{S::SignalLte, "rsrq", T::Double, F::LteRsrq, C::Rounded, -43, 20, "LTE RsrpRsrqSinr.rsrq0 (dB)"},
     ModemFieldRow{S::SignalLte, "snr", T::Double, F::LteSinr, C::HalfSteps, -23, 40, "LTE RsrpRsrqSinr.sinr0 (half dB)"},
     ModemFieldRow{S::SignalUmts, "rssi", T::Double, F::UmtsRssi, C::Rounded, -120, -25, "WCDMA RxInfo.rssi (dBm)"},
-    ModemFieldRow{S::SignalUmts, "rscp", T::Double, F::UmtsRscpIndex, C::UtraPowerIndex, -120, -25, "WCDMA RxInfo.rsrp_range (RSCP + 116)"},
+    ModemFieldRow{S::SignalUmts, "rscp", T::Double, F::UmtsRscpIndex, C::UtraPowerIndex, -116, -25, "WCDMA RxInfo.rsrp_range (RSCP + 116)"},
     ModemFieldRow{S::SignalUmts, "ecio", T::Double, F::UmtsEcioIndex, C::UtraQualityIndex, -24, 0, "WCDMA RxInfo.rsrq_range ((Ec/Io + 24) x 2)"},
     ModemFieldRow{S::SignalGsm, "rssi", T::Double, F::GsmRxlevDbm, C::Rounded, -110, -20, "GSM idle_rxlev_dBm (dBm)"},
     ModemFieldRow{S::LteCell, "physical-ci", T::HexString, F::LtePci, C::Hex, 0, 503, "LTE phy_cell_id / nbr_phys_cell_id"},
@@ -38,14 +41,14 @@ constexpr std::array kRows = {
     ModemFieldRow{S::LteCell, "earfcn", T::UInt32, F::LteBand, C::LteBandOfEarfcn, 0, 262143, "LTE freq_band_ind"},
     ModemFieldRow{S::LteCell, "tac", T::HexString, F::LteTac, C::Hex, 0, 65535, "LTE tracking_area_code"},
     ModemFieldRow{S::LteCell, "ci", T::HexString, F::LteCellId, C::Hex, 0, 268435455, "LTE cell_id"},
-    ModemFieldRow{S::LteCell, "rsrp", T::Double, F::LteNbrRsrp, C::LtePowerIndex, -156, -31, "LTE nbr_rsrp (RSRP + 140)"},
-    ModemFieldRow{S::LteCell, "rsrq", T::Double, F::LteNbrRsrq, C::LteQualityHalfSteps, -34, 2.5, "LTE nbr_rsrq ((RSRQ + 19.5) x 2)"},
+    ModemFieldRow{S::LteCell, "rsrp", T::Double, F::LteNbrRsrp, C::LtePowerIndex, -140, -31, "LTE nbr_rsrp (RSRP + 140)"},
+    ModemFieldRow{S::LteCell, "rsrq", T::Double, F::LteNbrRsrq, C::LteQualityHalfSteps, -19.5, 2.5, "LTE nbr_rsrq ((RSRQ + 19.5) x 2)"},
     ModemFieldRow{S::UmtsCell, "lac", T::HexString, F::UmtsLac, C::Hex, 0, 65535, "WCDMA lac"},
     ModemFieldRow{S::UmtsCell, "ci", T::HexString, F::UmtsCellId, C::Hex, 0, 268435455, "WCDMA cell_id"},
     ModemFieldRow{S::UmtsCell, "uarfcn", T::UInt32, F::UmtsUarfcn, C::Same, 0, 16383, "WCDMA dl_uarfcn / uarfcn"},
     ModemFieldRow{S::UmtsCell, "uarfcn", T::UInt32, F::UmtsBand, C::UmtsBandOfUarfcn, 0, 16383, "WCDMA wcdma_band"},
     ModemFieldRow{S::UmtsCell, "psc", T::UInt32, F::UmtsPsc, C::Same, 0, 511, "WCDMA psc"},
-    ModemFieldRow{S::UmtsCell, "rscp", T::Double, F::UmtsRscp, C::UtraPowerIndex, -120, -25, "UTRA neighbour rscp (RSCP + 116)"},
+    ModemFieldRow{S::UmtsCell, "rscp", T::Double, F::UmtsRscp, C::UtraPowerIndex, -116, -25, "UTRA neighbour rscp (RSCP + 116)"},
     ModemFieldRow{S::UmtsCell, "ecio", T::Double, F::UmtsEcno, C::UtraQualityHalfSteps, -24.5, 0, "UTRA neighbour ecno ((Ec/No + 24.5) x 2)"},
     ModemFieldRow{S::GsmCell, "lac", T::HexString, F::GsmLac, C::Hex, 0, 65535, "GSM lac"},
     ModemFieldRow{S::GsmCell, "ci", T::HexString, F::GsmCellId, C::Hex, 0, 65535, "GSM cell_id"},

@@ -498,16 +498,18 @@ class ModemManagerBaseband::Poller {
             queries.swap(shared_.queries);
         }
         const std::uint64_t now = wallClockMs();
+        FieldIssues issues;
         for (const Query& q : queries) {
             sink_(velk::kEventTrigger, triggerEvent(q));
             std::optional<Bytes> payload;
             if (q.metricID == kSimFilesMetricID) {
                 payload = simFilesPayload(reading_, now);
             } else if (const ModemKind* kind = findModemKind(q.metricID); kind && haveReading_) {
-                payload = kind->write(reading_, now);
+                payload = kind->write(reading_, now, issues);
             }
             if (payload) sink_(velk::kEventMetric, metricEvent(q.metricID, std::move(*payload)));
         }
+        for (const std::string& line : issues) faults_.once(line);
     }
 
     void emitDue() {
@@ -522,12 +524,14 @@ class ModemManagerBaseband::Poller {
             }
         }
         const std::uint64_t now = wallClockMs();
+        FieldIssues issues;
         for (const std::int64_t id : due) {
             const ModemKind* kind = findModemKind(id);
             if (kind == nullptr) continue;
-            if (auto payload = kind->write(reading_, now))
+            if (auto payload = kind->write(reading_, now, issues))
                 sink_(velk::kEventMetric, metricEvent(id, std::move(*payload)));
         }
+        for (const std::string& line : issues) faults_.once(line);
     }
 
     // Waits for wait, or less when stopped, asked something or told of a modem coming or

@@ -1,8 +1,12 @@
 #include "sources/modem/ModemPayloads.h"
 
+#include <algorithm>
 #include <array>
+#include <limits>
 #include <memory>
+#include <string>
 
+#include "core/Format.h"
 #include "messages/Messages.h"
 #include "sources/sim/Identities.h"
 
@@ -12,14 +16,35 @@ namespace {
 
 using F = Field;
 
-// Calls set with the field's integer, when the field has one.
+// A field's integer that its message field cannot hold: left out, with one line.
+void doesNotFit(Field field, std::int64_t value, const char* type, FieldIssues& issues) {
+    const auto rows = modemFieldTable();
+    const auto row = std::find_if(rows.begin(), rows.end(),
+                                  [&](const ModemFieldRow& r) { return r.field == field; });
+    if (row == rows.end()) return;
+    issues.push_back(
+        format("ModemManager %s %s: becomes %lld for %s, which %s cannot hold; left out",
+               std::string(sourceName(row->source)).c_str(), std::string(row->key).c_str(),
+               static_cast<long long>(value), std::string(row->target).c_str(), type));
+}
+
+// Calls set with the field's integer, when the field has one that the type holds.
 template <class Set>
-void putU32(const FieldValues& values, Field field, Set set) {
-    if (const auto v = values.number(field)) set(static_cast<std::uint32_t>(*v));
+void putU32(const FieldValues& values, Field field, FieldIssues& issues, Set set) {
+    const auto v = values.number(field);
+    if (!v) return;
+    if (*v < 0 || *v > std::numeric_limits<std::uint32_t>::max())
+        return doesNotFit(field, *v, "an unsigned 32-bit field", issues);
+    set(static_cast<std::uint32_t>(*v));
 }
 template <class Set>
-void putS32(const FieldValues& values, Field field, Set set) {
-    if (const auto v = values.number(field)) set(static_cast<std::int32_t>(*v));
+void putS32(const FieldValues& values, Field field, FieldIssues& issues, Set set) {
+    const auto v = values.number(field);
+    if (!v) return;
+    if (*v < std::numeric_limits<std::int32_t>::min() ||
+        *v > std::numeric_limits<std::int32_t>::max())
+        return doesNotFit(field, *v, "a signed 32-bit field", issues);
+    set(static_cast<std::int32_t>(*v));
 }
 
 // The PLMN of the registered operator, when its code was readable.
@@ -33,11 +58,11 @@ std::optional<Bytes> plmn(const ModemReading& r) {
 }
 
 template <class M>
-void putOperator(const ModemReading& r, M& m) {
-    putU32(r.modem3gpp, F::Mcc, [&](std::uint32_t v) { m.setMcc(v); });
-    putU32(r.modem3gpp, F::Mnc, [&](std::uint32_t v) { m.setMnc(v); });
+void putOperator(const ModemReading& r, M& m, FieldIssues& issues) {
+    putU32(r.modem3gpp, F::Mcc, issues, [&](std::uint32_t v) { m.setMcc(v); });
+    putU32(r.modem3gpp, F::Mnc, issues, [&](std::uint32_t v) { m.setMnc(v); });
     if constexpr (requires { m.setNumMncDigits(0U); })
-        putU32(r.modem3gpp, F::MncDigits, [&](std::uint32_t v) { m.setNumMncDigits(v); });
+        putU32(r.modem3gpp, F::MncDigits, issues, [&](std::uint32_t v) { m.setNumMncDigits(v); });
 }
 
 // The neighbours: cells that do not serve, of one technology.
@@ -47,38 +72,42 @@ void neighbours(const ModemReading& r, Rat rat, Each each) {
         if (!cell.serving && cell.rat == rat) each(cell.values);
 }
 
-std::optional<Bytes> lteScellInfo(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> lteScellInfo(const ModemReading& r, std::uint64_t timestamp,
+                                  FieldIssues& issues) {
     if (r.servingRat != Rat::Lte) return std::nullopt;
     KCellularLteScellInfo m;
     m.setTimestamp(timestamp);
     if (const CellValues* cell = r.servingCell()) {
         const FieldValues& v = cell->values;
-        putU32(v, F::LtePci, [&](std::uint32_t x) { m.setPhyCellId(x); });
-        putU32(v, F::LteEarfcn, [&](std::uint32_t x) { m.setDlFreq(x); });
-        putU32(v, F::LteCellId, [&](std::uint32_t x) { m.setCellId(x); });
-        putU32(v, F::LteBand, [&](std::uint32_t x) { m.setFreqBandInd(x); });
-        putU32(v, F::LteTac, [&](std::uint32_t x) { m.setTrackingAreaCode(x); });
+        putU32(v, F::LtePci, issues, [&](std::uint32_t x) { m.setPhyCellId(x); });
+        putU32(v, F::LteEarfcn, issues, [&](std::uint32_t x) { m.setDlFreq(x); });
+        putU32(v, F::LteCellId, issues, [&](std::uint32_t x) { m.setCellId(x); });
+        putU32(v, F::LteBand, issues, [&](std::uint32_t x) { m.setFreqBandInd(x); });
+        putU32(v, F::LteTac, issues, [&](std::uint32_t x) { m.setTrackingAreaCode(x); });
     } else {
-        putU32(r.location, F::LocationCi, [&](std::uint32_t x) { m.setCellId(x); });
-        putU32(r.location, F::LocationTac, [&](std::uint32_t x) { m.setTrackingAreaCode(x); });
+        putU32(r.location, F::LocationCi, issues, [&](std::uint32_t x) { m.setCellId(x); });
+        putU32(r.location, F::LocationTac, issues,
+               [&](std::uint32_t x) { m.setTrackingAreaCode(x); });
     }
-    putU32(r.modem3gpp, F::MncDigits, [&](std::uint32_t v) { m.setNumMncDigits(v); });
-    putU32(r.modem3gpp, F::Mcc, [&](std::uint32_t v) { m.setSelPlmnMcc(v); });
-    putU32(r.modem3gpp, F::Mnc, [&](std::uint32_t v) { m.setSelPlmnMnc(v); });
+    putU32(r.modem3gpp, F::MncDigits, issues, [&](std::uint32_t v) { m.setNumMncDigits(v); });
+    putU32(r.modem3gpp, F::Mcc, issues, [&](std::uint32_t v) { m.setSelPlmnMcc(v); });
+    putU32(r.modem3gpp, F::Mnc, issues, [&](std::uint32_t v) { m.setSelPlmnMnc(v); });
     return m.data();
 }
 
-std::optional<Bytes> lteRsrpRsrqSinr(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> lteRsrpRsrqSinr(const ModemReading& r, std::uint64_t timestamp,
+                                     FieldIssues& issues) {
     const FieldValues& s = r.signalLte;
     if (!s.has(F::LteRsrp) && !s.has(F::LteRsrq) && !s.has(F::LteSinr)) return std::nullopt;
     const auto sample = [&] {
         auto v = std::make_shared<RsrpRsrqSinr>();
         if (r.servingRat == Rat::Lte)
             if (const CellValues* cell = r.servingCell())
-                putU32(cell->values, F::LtePci, [&](std::uint32_t x) { v->setPhyCellId(x); });
-        putS32(s, F::LteRsrp, [&](std::int32_t x) { v->setRsrp0(x); });
-        putS32(s, F::LteRsrq, [&](std::int32_t x) { v->setRsrq0(x); });
-        putS32(s, F::LteSinr, [&](std::int32_t x) { v->setSinr0(x); });
+                putU32(cell->values, F::LtePci, issues,
+                       [&](std::uint32_t x) { v->setPhyCellId(x); });
+        putS32(s, F::LteRsrp, issues, [&](std::int32_t x) { v->setRsrp0(x); });
+        putS32(s, F::LteRsrq, issues, [&](std::int32_t x) { v->setRsrq0(x); });
+        putS32(s, F::LteSinr, issues, [&](std::int32_t x) { v->setSinr0(x); });
         return v;
     };
     KCellularLteRsrpRsrqSinr m;
@@ -89,175 +118,184 @@ std::optional<Bytes> lteRsrpRsrqSinr(const ModemReading& r, std::uint64_t timest
     return m.data();
 }
 
-std::optional<Bytes> lteIntraRatMeas(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> lteIntraRatMeas(const ModemReading& r, std::uint64_t timestamp,
+                                     FieldIssues& issues) {
     if (r.servingRat != Rat::Lte || !r.hasCellInfo) return std::nullopt;
     KCellularLteNbrEutraCellMeas m;
     m.setTimestamp(timestamp);
     neighbours(r, Rat::Lte, [&](const FieldValues& v) {
         auto meas = std::make_shared<EgwErrcNbrEutraMeas>();
-        putU32(v, F::LteEarfcn, [&](std::uint32_t x) { meas->setNbrEarfcn(x); });
-        putU32(v, F::LtePci, [&](std::uint32_t x) { meas->setNbrPhysCellId(x); });
-        putU32(v, F::LteBand, [&](std::uint32_t x) { meas->setFreqBandInd(x); });
-        putS32(v, F::LteNbrRsrp, [&](std::int32_t x) { meas->setNbrRsrp(x); });
-        putS32(v, F::LteNbrRsrq, [&](std::int32_t x) { meas->setNbrRsrq(x); });
+        putU32(v, F::LteEarfcn, issues, [&](std::uint32_t x) { meas->setNbrEarfcn(x); });
+        putU32(v, F::LtePci, issues, [&](std::uint32_t x) { meas->setNbrPhysCellId(x); });
+        putU32(v, F::LteBand, issues, [&](std::uint32_t x) { meas->setFreqBandInd(x); });
+        putS32(v, F::LteNbrRsrp, issues, [&](std::int32_t x) { meas->setNbrRsrp(x); });
+        putS32(v, F::LteNbrRsrq, issues, [&](std::int32_t x) { meas->setNbrRsrq(x); });
         m.addMeasNbrEutra(std::move(meas));
     });
     return m.data();
 }
 
-std::optional<Bytes> lteInterRatMeas(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> lteInterRatMeas(const ModemReading& r, std::uint64_t timestamp,
+                                     FieldIssues& issues) {
     if (r.servingRat != Rat::Lte || !r.hasCellInfo) return std::nullopt;
     KCellularLteNbrInterRatCellMeas m;
     m.setTimestamp(timestamp);
     neighbours(r, Rat::Umts, [&](const FieldValues& v) {
         auto meas = std::make_shared<EgwErrcNbrUtraMeas>();
-        putU32(v, F::UmtsUarfcn, [&](std::uint32_t x) { meas->setUarfcn(x); });
-        putU32(v, F::UmtsPsc, [&](std::uint32_t x) { meas->setPsc(x); });
-        putS32(v, F::UmtsRscp, [&](std::int32_t x) { meas->setRscp(x); });
-        putU32(v, F::UmtsEcno, [&](std::uint32_t x) { meas->setEcno(x); });
+        putU32(v, F::UmtsUarfcn, issues, [&](std::uint32_t x) { meas->setUarfcn(x); });
+        putU32(v, F::UmtsPsc, issues, [&](std::uint32_t x) { meas->setPsc(x); });
+        putS32(v, F::UmtsRscp, issues, [&](std::int32_t x) { meas->setRscp(x); });
+        putU32(v, F::UmtsEcno, issues, [&](std::uint32_t x) { meas->setEcno(x); });
         m.addMeasNbrUtra(std::move(meas));
     });
     neighbours(r, Rat::Gsm, [&](const FieldValues& v) {
         auto meas = std::make_shared<EgwErrcNbrGeranMeas>();
-        putU32(v, F::GsmArfcn, [&](std::uint32_t x) { meas->setArfcn(x); });
-        putU32(v, F::GsmBsic, [&](std::uint32_t x) { meas->setBsic(x); });
-        putU32(v, F::GsmRxlev, [&](std::uint32_t x) { meas->setRxlev(x); });
+        putU32(v, F::GsmArfcn, issues, [&](std::uint32_t x) { meas->setArfcn(x); });
+        putU32(v, F::GsmBsic, issues, [&](std::uint32_t x) { meas->setBsic(x); });
+        putU32(v, F::GsmRxlev, issues, [&](std::uint32_t x) { meas->setRxlev(x); });
         m.addMeasNbrGeran(std::move(meas));
     });
     return m.data();
 }
 
-std::optional<Bytes> umtsScellInfo(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> umtsScellInfo(const ModemReading& r, std::uint64_t timestamp,
+                                   FieldIssues& issues) {
     if (r.servingRat != Rat::Umts) return std::nullopt;
     KCellularWcdmaCellInfo m;
     m.setTimestamp(timestamp);
-    putOperator(r, m);
+    putOperator(r, m, issues);
     if (const CellValues* cell = r.servingCell()) {
         const FieldValues& v = cell->values;
-        putU32(v, F::UmtsLac, [&](std::uint32_t x) { m.setLac(x); });
-        putU32(v, F::UmtsCellId, [&](std::uint32_t x) { m.setCellId(x); });
-        putS32(v, F::UmtsBand, [&](std::int32_t x) { m.setWcdmaBand(x); });
-        putU32(v, F::UmtsUarfcn, [&](std::uint32_t x) { m.setDlUarfcn(x); });
-        putU32(v, F::UmtsPsc, [&](std::uint32_t x) { m.setPsc(x); });
+        putU32(v, F::UmtsLac, issues, [&](std::uint32_t x) { m.setLac(x); });
+        putU32(v, F::UmtsCellId, issues, [&](std::uint32_t x) { m.setCellId(x); });
+        putS32(v, F::UmtsBand, issues, [&](std::int32_t x) { m.setWcdmaBand(x); });
+        putU32(v, F::UmtsUarfcn, issues, [&](std::uint32_t x) { m.setDlUarfcn(x); });
+        putU32(v, F::UmtsPsc, issues, [&](std::uint32_t x) { m.setPsc(x); });
     } else {
-        putU32(r.location, F::LocationLac, [&](std::uint32_t x) { m.setLac(x); });
-        putU32(r.location, F::LocationCi, [&](std::uint32_t x) { m.setCellId(x); });
+        putU32(r.location, F::LocationLac, issues, [&](std::uint32_t x) { m.setLac(x); });
+        putU32(r.location, F::LocationCi, issues, [&](std::uint32_t x) { m.setCellId(x); });
     }
     return m.data();
 }
 
-std::optional<Bytes> umtsScellMeas(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> umtsScellMeas(const ModemReading& r, std::uint64_t timestamp,
+                                   FieldIssues& issues) {
     const FieldValues& s = r.signalUmts;
     if (!s.has(F::UmtsRssi) && !s.has(F::UmtsRscpIndex) && !s.has(F::UmtsEcioIndex))
         return std::nullopt;
     KCellularWcdmaScellMeasurement m;
     m.setTimestamp(timestamp);
     auto rx = std::make_shared<RxInfo>();
-    putS32(s, F::UmtsRssi, [&](std::int32_t x) { rx->setRssi(x); });
-    putU32(s, F::UmtsRscpIndex, [&](std::uint32_t x) { rx->setRsrpRange(x); });
-    putU32(s, F::UmtsEcioIndex, [&](std::uint32_t x) { rx->setRsrqRange(x); });
+    putS32(s, F::UmtsRssi, issues, [&](std::int32_t x) { rx->setRssi(x); });
+    putU32(s, F::UmtsRscpIndex, issues, [&](std::uint32_t x) { rx->setRsrpRange(x); });
+    putU32(s, F::UmtsEcioIndex, issues, [&](std::uint32_t x) { rx->setRsrqRange(x); });
     m.addRxInfo(std::move(rx));
     return m.data();
 }
 
-std::optional<Bytes> umtsNcellMeas(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> umtsNcellMeas(const ModemReading& r, std::uint64_t timestamp,
+                                   FieldIssues& issues) {
     if (r.servingRat != Rat::Umts || !r.hasCellInfo) return std::nullopt;
     KCellularWcdmaNbrCellMeas m;
     m.setTimestamp(timestamp);
     neighbours(r, Rat::Umts, [&](const FieldValues& v) {
         auto meas = std::make_shared<UtraCellMeasResult>();
-        putU32(v, F::UmtsUarfcn, [&](std::uint32_t x) { meas->setUarfcn(x); });
-        putU32(v, F::UmtsPsc, [&](std::uint32_t x) { meas->setPsc(x); });
-        putU32(v, F::UmtsEcno, [&](std::uint32_t x) { meas->setEcno(x); });
-        putS32(v, F::UmtsRscp, [&](std::int32_t x) { meas->setRscp(x); });
+        putU32(v, F::UmtsUarfcn, issues, [&](std::uint32_t x) { meas->setUarfcn(x); });
+        putU32(v, F::UmtsPsc, issues, [&](std::uint32_t x) { meas->setPsc(x); });
+        putU32(v, F::UmtsEcno, issues, [&](std::uint32_t x) { meas->setEcno(x); });
+        putS32(v, F::UmtsRscp, issues, [&](std::int32_t x) { meas->setRscp(x); });
         m.addMeasUtraResult(std::move(meas));
     });
     neighbours(r, Rat::Gsm, [&](const FieldValues& v) {
         auto meas = std::make_shared<GsmCellMeasResult>();
-        putU32(v, F::GsmArfcn, [&](std::uint32_t x) { meas->setArfcn(x); });
-        putU32(v, F::GsmBsic, [&](std::uint32_t x) { meas->setBsic(x); });
-        putU32(v, F::GsmRxlev, [&](std::uint32_t x) { meas->setRxlev(x); });
+        putU32(v, F::GsmArfcn, issues, [&](std::uint32_t x) { meas->setArfcn(x); });
+        putU32(v, F::GsmBsic, issues, [&](std::uint32_t x) { meas->setBsic(x); });
+        putU32(v, F::GsmRxlev, issues, [&](std::uint32_t x) { meas->setRxlev(x); });
         m.addMeasGsmResult(std::move(meas));
     });
     neighbours(r, Rat::Lte, [&](const FieldValues& v) {
         auto meas = std::make_shared<LteCellMeasResult>();
-        putU32(v, F::LteEarfcn, [&](std::uint32_t x) { meas->setEarfcn(x); });
-        putU32(v, F::LtePci, [&](std::uint32_t x) { meas->setPhyCellId(x); });
-        putU32(v, F::LteBand, [&](std::uint32_t x) { meas->setEutraBand(x); });
-        putS32(v, F::LteNbrRsrp, [&](std::int32_t x) { meas->setRsrp(x); });
-        putS32(v, F::LteNbrRsrq, [&](std::int32_t x) { meas->setRsrq(x); });
+        putU32(v, F::LteEarfcn, issues, [&](std::uint32_t x) { meas->setEarfcn(x); });
+        putU32(v, F::LtePci, issues, [&](std::uint32_t x) { meas->setPhyCellId(x); });
+        putU32(v, F::LteBand, issues, [&](std::uint32_t x) { meas->setEutraBand(x); });
+        putS32(v, F::LteNbrRsrp, issues, [&](std::int32_t x) { meas->setRsrp(x); });
+        putS32(v, F::LteNbrRsrq, issues, [&](std::int32_t x) { meas->setRsrq(x); });
         m.addMeasLteResult(std::move(meas));
     });
     return m.data();
 }
 
-std::optional<Bytes> gsmScellInfo(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> gsmScellInfo(const ModemReading& r, std::uint64_t timestamp,
+                                  FieldIssues& issues) {
     if (r.servingRat != Rat::Gsm) return std::nullopt;
     KCellularGsmScellInfo m;
     m.setTimestamp(timestamp);
-    putOperator(r, m);
+    putOperator(r, m, issues);
     if (const CellValues* cell = r.servingCell()) {
         const FieldValues& v = cell->values;
-        putU32(v, F::GsmLac, [&](std::uint32_t x) { m.setLac(x); });
-        putU32(v, F::GsmCellId, [&](std::uint32_t x) { m.setCellId(x); });
-        putU32(v, F::GsmArfcn, [&](std::uint32_t x) { m.setArfcn(x); });
-        putU32(v, F::GsmBsic, [&](std::uint32_t x) { m.setBsic(x); });
+        putU32(v, F::GsmLac, issues, [&](std::uint32_t x) { m.setLac(x); });
+        putU32(v, F::GsmCellId, issues, [&](std::uint32_t x) { m.setCellId(x); });
+        putU32(v, F::GsmArfcn, issues, [&](std::uint32_t x) { m.setArfcn(x); });
+        putU32(v, F::GsmBsic, issues, [&](std::uint32_t x) { m.setBsic(x); });
     } else {
-        putU32(r.location, F::LocationLac, [&](std::uint32_t x) { m.setLac(x); });
-        putU32(r.location, F::LocationCi, [&](std::uint32_t x) { m.setCellId(x); });
+        putU32(r.location, F::LocationLac, issues, [&](std::uint32_t x) { m.setLac(x); });
+        putU32(r.location, F::LocationCi, issues, [&](std::uint32_t x) { m.setCellId(x); });
     }
     return m.data();
 }
 
-std::optional<Bytes> gsmIdleScellMeas(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> gsmIdleScellMeas(const ModemReading& r, std::uint64_t timestamp,
+                                      FieldIssues& issues) {
     if (!r.signalGsm.has(F::GsmRxlevDbm)) return std::nullopt;
     KCellularGsmIdleScellMeasurement m;
     m.setTimestamp(timestamp);
     if (r.servingRat == Rat::Gsm)
         if (const CellValues* cell = r.servingCell())
-            putU32(cell->values, F::GsmArfcn, [&](std::uint32_t x) { m.setScellArfcn(x); });
-    putS32(r.signalGsm, F::GsmRxlevDbm, [&](std::int32_t x) { m.setIdleRxlevDBm(x); });
+            putU32(cell->values, F::GsmArfcn, issues, [&](std::uint32_t x) { m.setScellArfcn(x); });
+    putS32(r.signalGsm, F::GsmRxlevDbm, issues, [&](std::int32_t x) { m.setIdleRxlevDBm(x); });
     return m.data();
 }
 
-std::optional<Bytes> gsmNcellMeas(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> gsmNcellMeas(const ModemReading& r, std::uint64_t timestamp,
+                                  FieldIssues& issues) {
     if (r.servingRat != Rat::Gsm || !r.hasCellInfo) return std::nullopt;
     KCellularGsmGrrEventMeasCr m;
     m.setTimestamp(timestamp);
     neighbours(r, Rat::Gsm, [&](const FieldValues& v) {
         auto meas = std::make_shared<GsmNcellMeas>();
-        putOperator(r, *meas);
-        putU32(v, F::GsmLac, [&](std::uint32_t x) { meas->setLac(x); });
-        putU32(v, F::GsmCellId, [&](std::uint32_t x) { meas->setCi(x); });
-        putU32(v, F::GsmBsic, [&](std::uint32_t x) { meas->setBsic(x); });
-        putU32(v, F::GsmArfcn, [&](std::uint32_t x) { meas->setArfcn(x); });
-        putU32(v, F::GsmRxlev, [&](std::uint32_t x) { meas->setRxlev(x); });
+        putOperator(r, *meas, issues);
+        putU32(v, F::GsmLac, issues, [&](std::uint32_t x) { meas->setLac(x); });
+        putU32(v, F::GsmCellId, issues, [&](std::uint32_t x) { meas->setCi(x); });
+        putU32(v, F::GsmBsic, issues, [&](std::uint32_t x) { meas->setBsic(x); });
+        putU32(v, F::GsmArfcn, issues, [&](std::uint32_t x) { meas->setArfcn(x); });
+        putU32(v, F::GsmRxlev, issues, [&](std::uint32_t x) { meas->setRxlev(x); });
         m.addGsmNcellMeas(std::move(meas));
     });
     neighbours(r, Rat::Umts, [&](const FieldValues& v) {
         auto meas = std::make_shared<UmtsNcellMeas>();
-        putU32(v, F::UmtsPsc, [&](std::uint32_t x) { meas->setCpichSc(x); });
-        putU32(v, F::UmtsUarfcn, [&](std::uint32_t x) { meas->setDlUarfcn(x); });
-        putU32(v, F::UmtsRscp, [&](std::uint32_t x) { meas->setCpichRscp(x); });
-        putU32(v, F::UmtsEcno, [&](std::uint32_t x) { meas->setCpichEcn0(x); });
+        putU32(v, F::UmtsPsc, issues, [&](std::uint32_t x) { meas->setCpichSc(x); });
+        putU32(v, F::UmtsUarfcn, issues, [&](std::uint32_t x) { meas->setDlUarfcn(x); });
+        putU32(v, F::UmtsRscp, issues, [&](std::uint32_t x) { meas->setCpichRscp(x); });
+        putU32(v, F::UmtsEcno, issues, [&](std::uint32_t x) { meas->setCpichEcn0(x); });
         m.addUmtsNcellMeas(std::move(meas));
     });
     neighbours(r, Rat::Lte, [&](const FieldValues& v) {
         auto meas = std::make_shared<LteNcellMeas>();
-        putU32(v, F::LtePci, [&](std::uint32_t x) { meas->setPhysicalCellId(x); });
-        putU32(v, F::LteNbrRsrp, [&](std::uint32_t x) { meas->setRsrp(x); });
-        putU32(v, F::LteEarfcn, [&](std::uint32_t x) { meas->setEarfcn(x); });
-        putU32(v, F::LteNbrRsrq, [&](std::uint32_t x) { meas->setRsrq(x); });
+        putU32(v, F::LtePci, issues, [&](std::uint32_t x) { meas->setPhysicalCellId(x); });
+        putU32(v, F::LteNbrRsrp, issues, [&](std::uint32_t x) { meas->setRsrp(x); });
+        putU32(v, F::LteEarfcn, issues, [&](std::uint32_t x) { meas->setEarfcn(x); });
+        putU32(v, F::LteNbrRsrq, issues, [&](std::uint32_t x) { meas->setRsrq(x); });
         m.addLteNcellMeas(std::move(meas));
     });
     return m.data();
 }
 
-std::optional<Bytes> emmContext(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> emmContext(const ModemReading& r, std::uint64_t timestamp,
+                                FieldIssues& issues) {
     if (!r.modem3gpp.has(F::RegStatus)) return std::nullopt;
     KCellularEmmContext m;
     m.setTimestamp(timestamp);
-    putS32(r.modem3gpp, F::RegStatus, [&](std::int32_t x) { m.setRegStatus(x); });
+    putS32(r.modem3gpp, F::RegStatus, issues, [&](std::int32_t x) { m.setRegStatus(x); });
     std::optional<std::int64_t> tac = r.location.number(F::LocationTac);
     if (r.servingRat == Rat::Lte)
         if (const CellValues* cell = r.servingCell()) tac = cell->values.number(F::LteTac);
@@ -271,7 +309,8 @@ std::optional<Bytes> emmContext(const ModemReading& r, std::uint64_t timestamp) 
     return m.data();
 }
 
-std::optional<Bytes> activeBearers(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> activeBearers(const ModemReading& r, std::uint64_t timestamp,
+                                   FieldIssues& issues) {
     constexpr std::int32_t kIPv4 = 0, kIPv6 = 1;
     KCellularActivatedBearerContexts m;
     m.setTimestamp(timestamp);
@@ -281,7 +320,7 @@ std::optional<Bytes> activeBearers(const ModemReading& r, std::uint64_t timestam
         auto b = std::make_shared<BearerContext>();
         b->setCid(cid++);
         if (const std::string* apn = v.text(F::BearerApn)) b->setApn(*apn);
-        putS32(v, F::BearerPdpType, [&](std::int32_t x) { b->setPdpType(x); });
+        putS32(v, F::BearerPdpType, issues, [&](std::int32_t x) { b->setPdpType(x); });
         Bytes address;
         if (const Bytes* a = v.bytes(F::BearerIpv4)) address = *a;
         if (const Bytes* a = v.bytes(F::BearerIpv6))
@@ -310,7 +349,7 @@ std::shared_ptr<ElementaryFile> file(std::uint32_t id, Bytes content) {
     return ef;
 }
 
-std::optional<Bytes> simFiles(const ModemReading& r, std::uint64_t timestamp) {
+std::optional<Bytes> simFiles(const ModemReading& r, std::uint64_t timestamp, FieldIssues&) {
     if (!r.sim.has(F::SimIccid) && !r.sim.has(F::SimImsi)) return std::nullopt;
     return simFilesPayload(r, timestamp);
 }

@@ -1,5 +1,6 @@
 // The metric kinds the ModemManager source writes, and their payloads, written with our
-// message classes from what the modem said. A kind the modem has nothing for has no payload.
+// message classes from what the modem said. A kind the modem has nothing for has no payload; a
+// value that its message field cannot hold is left out, with one line in the issues.
 #pragma once
 
 #include <cstdint>
@@ -12,8 +13,8 @@
 
 namespace pyx::modem {
 
-using PayloadWriter = std::optional<Bytes> (*)(const ModemReading& reading,
-                                               std::uint64_t timestamp);
+using PayloadWriter = std::optional<Bytes> (*)(const ModemReading& reading, std::uint64_t timestamp,
+                                               FieldIssues& issues);
 
 struct ModemKind {
     std::int64_t metricID;  // the catalogue's ID

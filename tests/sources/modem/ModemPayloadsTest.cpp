@@ -2,6 +2,8 @@
 // payload writers, fed through the store, read through the screen controller.
 #include <gtest/gtest.h>
 
+#include <cstdio>
+
 #include "ScreenText.h"
 #include "metrics/MetricCatalogue.h"
 #include "sources/modem/ModemPayloads.h"
@@ -34,13 +36,14 @@ class ModemScreens : public ::testing::Test {
         const ModemReading reading = readModem(facts, issues);
         EXPECT_TRUE(issues.empty()) << issues.front();
         for (const ModemKind& kind : modemKinds()) {
-            const auto payload = kind.write(reading, kTimestamp);
+            const auto payload = kind.write(reading, kTimestamp, issues);
             if (!payload) continue;
             Dict record;
             record.append("kKeyMetricID", Value(kind.metricID));
             record.append("kKeyPayload", Value(*payload));
             EXPECT_TRUE(store->isMetricIDValidWithMetricdict(record)) << kind.messageClass;
         }
+        EXPECT_TRUE(issues.empty()) << issues.front();
     }
     std::optional<std::string> shown(const std::string& group, const std::string& category,
                                      const std::string& key, int section = 0) {
@@ -54,6 +57,88 @@ TEST(ModemKinds, EveryKindIsTheCataloguesKindOfTheSameMessageClass) {
         ASSERT_NE(catalogued, nullptr) << kind.messageClass;
         EXPECT_EQ(catalogued->messageClass, kind.messageClass);
     }
+}
+
+// A reading in which field has value wherever a writer may look for it: in every dictionary,
+// every bearer and a serving and a neighbour cell of each technology, with rat serving.
+ModemReading everywhere(Field field, const Value& value, Rat rat) {
+    ModemReading r;
+    for (FieldValues* v :
+         {&r.modem, &r.modem3gpp, &r.signalLte, &r.signalUmts, &r.signalGsm, &r.location, &r.sim})
+        v->set(field, value);
+    r.hasCellInfo = true;
+    for (const Rat cellRat : {Rat::Lte, Rat::Umts, Rat::Gsm})
+        for (const bool serving : {true, false}) {
+            CellValues cell{cellRat, serving, {}};
+            cell.values.set(field, value);
+            r.cells.push_back(cell);
+        }
+    r.bearers.emplace_back().set(field, value);
+    r.servingRat = rat;
+    return r;
+}
+
+// The value a row is given at one end of its range, as the D-Bus edge hands it over.
+std::optional<Value> given(const ModemFieldRow& row, double end) {
+    switch (row.type) {
+        case DbusType::Double:
+            return d(end);
+        case DbusType::UInt32:
+            return u(static_cast<std::uint32_t>(end));
+        case DbusType::HexString: {
+            char hex[16];
+            std::snprintf(hex, sizeof hex, "%X", static_cast<unsigned>(end));
+            return Value(std::string(hex));
+        }
+        default:
+            return std::nullopt;  // text and booleans: their range is not of the value
+    }
+}
+
+TEST(ModemKinds, EveryRowsRangeConvertedFitsEveryFieldTheRowFeeds) {
+    for (const ModemFieldRow& row : modemFieldTable()) {
+        for (const double end : {row.min, row.max}) {
+            const auto value = given(row, end);
+            if (!value) continue;
+            Dict dict;
+            dict.append(std::string(row.key), *value);
+            FieldIssues issues;
+            const Value converted = mapRow(row, dict, issues);
+            if (converted.isNull()) continue;  // no band, an unknown state: nothing to write
+            for (const Rat rat : {Rat::Lte, Rat::Umts, Rat::Gsm}) {
+                const ModemReading reading = everywhere(row.field, converted, rat);
+                for (const ModemKind& kind : modemKinds())
+                    static_cast<void>(kind.write(reading, kTimestamp, issues));
+            }
+            EXPECT_TRUE(issues.empty()) << row.target << " at " << end << ": " << issues.front();
+        }
+    }
+}
+
+TEST(ModemKinds, AValueItsMessageFieldCannotHoldIsLeftOutWithOneLine) {
+    ModemReading reading;
+    reading.hasCellInfo = true;
+    reading.servingRat = Rat::Gsm;
+    CellValues umts{Rat::Umts, false, {}};
+    umts.values.set(Field::UmtsPsc, Value(std::int64_t{12}));
+    umts.values.set(Field::UmtsRscp, Value(std::int64_t{-4}));
+    reading.cells.push_back(umts);
+    FieldIssues issues;
+    const auto* kind = findModemKind(0x3CD009);  // the GSM neighbour report
+    ASSERT_NE(kind, nullptr);
+    const auto payload = kind->write(reading, kTimestamp, issues);
+    ASSERT_TRUE(payload);
+    ASSERT_EQ(issues.size(), 1U);
+    EXPECT_EQ(issues[0],
+              "ModemManager GetCellInfo UMTS cell rscp: becomes -4 for UTRA neighbour rscp (RSCP "
+              "+ 116), which an unsigned 32-bit field cannot hold; left out");
+    std::shared_ptr<MetricValidator> store = MetricValidator::create(nullptr);
+    Dict record;
+    record.append("kKeyMetricID", Value(kind->metricID));
+    record.append("kKeyPayload", Value(*payload));
+    ASSERT_TRUE(store->isMetricIDValidWithMetricdict(record));
+    EXPECT_EQ(test::shownOn(store, "GSM", "UMTS Neighbor Cell Meas", "cpich_sc"), "12");
+    EXPECT_EQ(test::shownOn(store, "GSM", "UMTS Neighbor Cell Meas", "cpich_rscp"), std::nullopt);
 }
 
 TEST_F(ModemScreens, LteValuesShowAsTheModemSaidThem) {
