@@ -7,6 +7,7 @@
 #include <string>
 
 #include "core/Format.h"
+#include "core/MetricKindList.h"
 #include "messages/Messages.h"
 #include "sources/sim/Identities.h"
 
@@ -354,21 +355,29 @@ std::optional<Bytes> simFiles(const ModemReading& r, std::uint64_t timestamp, Fi
     return simFilesPayload(r, timestamp);
 }
 
+// The catalogue's metric IDs, named by their constants.
+namespace id {
+#define PYX_KIND_ID(constant, metricID, ...) constexpr std::int64_t constant = metricID;
+PYX_METRIC_KINDS(PYX_KIND_ID)
+#undef PYX_KIND_ID
+}  // namespace id
+
 constexpr std::array kKinds = {
-    ModemKind{0x3C40C2, "KCellularLteScellInfo", lteScellInfo},
-    ModemKind{0x3C4F6A, "KCellularLteRsrpRsrqSinr", lteRsrpRsrqSinr},
-    ModemKind{0x3CD30F, "KCellularLteNbrEutraCellMeas", lteIntraRatMeas},
-    ModemKind{0x3CD310, "KCellularLteNbrInterRatCellMeas", lteInterRatMeas},
-    ModemKind{0x3C300C, "KCellularWcdmaCellInfo", umtsScellInfo},
-    ModemKind{0x3CD102, "KCellularWcdmaScellMeasurement", umtsScellMeas},
-    ModemKind{0x3CD105, "KCellularWcdmaNbrCellMeas", umtsNcellMeas},
-    ModemKind{0x3C2E0C, "KCellularGsmScellInfo", gsmScellInfo},
-    ModemKind{0x3CD002, "KCellularGsmIdleScellMeasurement", gsmIdleScellMeas},
-    ModemKind{0x3CD009, "KCellularGsmGrrEventMeasCr", gsmNcellMeas},
-    ModemKind{0x3CD50C, "KCellularEmmContext", emmContext},
-    ModemKind{0x3CD50D, "KCellularActivatedBearerContexts", activeBearers},
-    ModemKind{kSimFilesMetricID, "KCellularSimCardFiles", simFiles},
+    ModemKind{id::K_LTE_SCELL_INFO, lteScellInfo},
+    ModemKind{id::K_LTE_RSRP_RSRQ_SINR, lteRsrpRsrqSinr},
+    ModemKind{id::K_LTE_INTRARAT_MEAS, lteIntraRatMeas},
+    ModemKind{id::K_LTE_INTERRAT_MEAS, lteInterRatMeas},
+    ModemKind{id::K_UMTS_SCELL_INFO, umtsScellInfo},
+    ModemKind{id::K_UMTS_SCELL_MEAS, umtsScellMeas},
+    ModemKind{id::K_UMTS_NCELL_MEAS, umtsNcellMeas},
+    ModemKind{id::K_GSM_SCELL_INFO, gsmScellInfo},
+    ModemKind{id::K_GSM_IDLE_SCELL_MEAS, gsmIdleScellMeas},
+    ModemKind{id::K_GSM_NCELL_MEAS, gsmNcellMeas},
+    ModemKind{id::K_LTE_EMM_CTXT, emmContext},
+    ModemKind{id::K_CELLULAR_ACTIVE_BEARER, activeBearers},
+    ModemKind{id::K_SIM_FILE_INFO, simFiles},
 };
+static_assert(id::K_SIM_FILE_INFO == kSimFilesMetricID);
 
 }  // namespace
 

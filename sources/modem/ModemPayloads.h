@@ -6,7 +6,6 @@
 #include <cstdint>
 #include <optional>
 #include <span>
-#include <string_view>
 
 #include "core/Value.h"
 #include "sources/modem/ModemReading.h"
@@ -17,8 +16,7 @@ using PayloadWriter = std::optional<Bytes> (*)(const ModemReading& reading, std:
                                                FieldIssues& issues);
 
 struct ModemKind {
-    std::int64_t metricID;  // the catalogue's ID
-    std::string_view messageClass;
+    std::int64_t metricID;  // the catalogue's ID; its message class is the catalogue's
     PayloadWriter write;
 };
 

@@ -7,24 +7,19 @@
 
 #include "ScreenText.h"
 #include "baseband/velk/Names.h"
+#include "core/Format.h"
+#include "sources/modem/ModemPayloads.h"
+#include "sources/sim/Timeline.h"
 
 namespace pyx::test {
 
-const char kModemTestConfiguration[] =
-    "metric 0x3C40C2 every 200ms\n"
-    "metric 0x3C4F6A every 200ms\n"
-    "metric 0x3CD30F every 200ms\n"
-    "metric 0x3CD310 every 200ms\n"
-    "metric 0x3C300C every 200ms\n"
-    "metric 0x3CD102 every 200ms\n"
-    "metric 0x3CD105 every 200ms\n"
-    "metric 0x3C2E0C every 200ms\n"
-    "metric 0x3CD002 every 200ms\n"
-    "metric 0x3CD009 every 200ms\n"
-    "metric 0x3CD50C every 200ms\n"
-    "metric 0x3CD50D every 200ms\n"
-    "metric 0x3C0013 every 1s\n"
-    "metric 0x3C4E04 every 1s      # RRC state: not one a modem says\n";
+std::string modemTestConfiguration() {
+    std::string text;
+    for (const modem::ModemKind& kind : modem::modemKinds())
+        text += format("metric 0x%llX every %s\n", static_cast<unsigned long long>(kind.metricID),
+                       kind.metricID == sim::kSimFilesMetricID ? "1s" : "200ms");
+    return text + "metric 0x3C4E04 every 1s      # RRC state: not one a modem says\n";
+}
 
 namespace {
 
@@ -55,7 +50,7 @@ ModemHarness::~ModemHarness() {
 }
 
 void ModemHarness::start() {
-    const std::string text = kModemTestConfiguration;
+    const std::string text = modemTestConfiguration();
     const Bytes bytes(text.begin(), text.end());
     const auto cleared =
         transport_->performCommand(velk::kCommandClearConfiguration, Value(command({})), nullptr);

@@ -18,9 +18,9 @@
 
 namespace pyx::test {
 
-// The metrics of the configuration the tests push: every kind the modem source writes, polled
-// every 200 ms.
-extern const char kModemTestConfiguration[];
+// The configuration the tests push: every kind the modem source writes, polled every 200 ms
+// (the SIM files every second), and one kind it does not write.
+[[nodiscard]] std::string modemTestConfiguration();
 
 class ModemHarness {
   public:
@@ -28,7 +28,7 @@ class ModemHarness {
     explicit ModemHarness(std::optional<std::uint32_t> modemIndex = std::nullopt);
     ~ModemHarness();
 
-    // Pushes kModemTestConfiguration (asserting it is accepted) and starts the events.
+    // Pushes modemTestConfiguration() (asserting it is accepted) and starts the events.
     void start();
     // Asks for the SIM files as the viewer does.
     void querySimFiles();
