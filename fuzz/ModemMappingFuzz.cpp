@@ -20,6 +20,7 @@
 #include "core/Log.h"
 #include "metrics/MetricCatalogue.h"
 #include "sources/modem/ModemPayloads.h"
+#include "sources/sim/BasebandCommands.h"
 
 namespace {
 
@@ -131,6 +132,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     for (const modem::ModemKind& kind : modem::modemKinds())
         if (const auto payload = kind.write(reading, 1500000000123ULL, issues))
             expectDecodes(kind.metricID, *payload);
-    expectDecodes(modem::kSimFilesMetricID, modem::simFilesPayload(reading, 1500000000123ULL));
+    expectDecodes(pyx::sim::kSimFilesMetricID, modem::simFilesPayload(reading, 1500000000123ULL));
     return 0;
 }

@@ -11,6 +11,7 @@
 #include <stop_token>
 #include <string_view>
 #include <utility>
+#include <variant>
 #include <vector>
 
 #include "baseband/velk/Names.h"
@@ -18,6 +19,7 @@
 #include "sources/modem/DbusValue.h"
 #include "sources/modem/FaultReporter.h"
 #include "sources/modem/ModemPayloads.h"
+#include "sources/sim/BasebandCommands.h"
 #include "sources/sim/DeviceConfig.h"
 
 namespace pyx::modem {
@@ -40,9 +42,6 @@ constexpr char kSim[] = "org.freedesktop.ModemManager1.Sim";
 constexpr char kBearer[] = "org.freedesktop.ModemManager1.Bearer";
 constexpr std::uint32_t kLocation3gppLacCi = 1;
 
-// The trigger with which the SIM files are asked for (with metric ID 0).
-constexpr std::int64_t kSimFilesTriggerID = 0x7F0013;
-constexpr milliseconds kShortestPeriod{100};
 constexpr milliseconds kWaitSlice{50};
 
 bool nameIs(const sdbus::Error& e, std::initializer_list<std::string_view> names) {
@@ -73,47 +72,6 @@ bool connectionLost(const sdbus::Error& e) {
     return e.getName().starts_with("System.Error.") && !timedOut(e);
 }
 
-std::uint64_t wallClockMs() {
-    return static_cast<std::uint64_t>(std::chrono::duration_cast<milliseconds>(
-                                          std::chrono::system_clock::now().time_since_epoch())
-                                          .count());
-}
-
-std::optional<std::int64_t> intAt(const Dict& input, const char* key) {
-    const Value* value = input.find(key);
-    return value ? value->toInt64() : std::nullopt;
-}
-
-velk::Result badInput(const char* what) {
-    return velk::Result(velk::kCodeBadInput, what);
-}
-
-Value metricEvent(std::int64_t metricID, Bytes payload) {
-    Dict event;
-    event.append(velk::kKeyMetricID, Value(metricID));
-    event.append(velk::kKeyPayload, Value(std::move(payload)));
-    event.append(velk::kKeyPayloadType, Value(std::int64_t{0}));
-    event.append(velk::kKeyProfileID, Value(std::int64_t{0}));
-    return Value(std::move(event));
-}
-
-struct Query {
-    std::int64_t triggerID = 0;
-    std::int64_t triggerRef = 0;
-    std::int64_t triggerType = 0;
-    std::int64_t profileID = 0;
-    std::int64_t metricID = 0;  // the kind to answer with
-};
-
-Value triggerEvent(const Query& q) {
-    Dict event;
-    event.append(velk::kKeyTriggerID, Value(q.triggerID));
-    event.append(velk::kKeyTriggerRef, Value(q.triggerRef));
-    event.append(velk::kKeyTriggerType, Value(q.triggerType));
-    event.append(velk::kKeyProfileID, Value(q.profileID));
-    return Value(std::move(event));
-}
-
 using Properties = std::map<std::string, sdbus::Variant>;
 using Interfaces = std::map<std::string, Properties>;
 using ManagedObjects = std::map<sdbus::ObjectPath, Interfaces>;
@@ -131,7 +89,7 @@ struct ModemManagerBaseband::Shared {
     std::vector<Due> schedule;  // the configured kinds this source writes
     milliseconds period{0};     // the poll period
     std::uint64_t generation = 0;
-    std::deque<Query> queries;
+    std::deque<sim::MetricQuery> queries;
     std::atomic<bool> wake{false};
 };
 
@@ -492,22 +450,24 @@ class ModemManagerBaseband::Poller {
     }
 
     void answerQueries() {
-        std::deque<Query> queries;
+        std::deque<sim::MetricQuery> queries;
         {
             const std::lock_guard lock(shared_.mutex);
             queries.swap(shared_.queries);
         }
-        const std::uint64_t now = wallClockMs();
+        const std::uint64_t now = sim::wallClockMs();
         FieldIssues issues;
-        for (const Query& q : queries) {
-            sink_(velk::kEventTrigger, triggerEvent(q));
+        for (const sim::MetricQuery& q : queries) {
+            sink_(velk::kEventTrigger,
+                  sim::triggerEvent(q.triggerID, q.triggerRef, q.triggerType, q.profileID));
             std::optional<Bytes> payload;
-            if (q.metricID == kSimFilesMetricID) {
+            if (q.metricID == sim::kSimFilesMetricID) {
                 payload = simFilesPayload(reading_, now);
             } else if (const ModemKind* kind = findModemKind(q.metricID); kind && haveReading_) {
                 payload = kind->write(reading_, now, issues);
             }
-            if (payload) sink_(velk::kEventMetric, metricEvent(q.metricID, std::move(*payload)));
+            if (payload)
+                sink_(velk::kEventMetric, sim::metricEvent(q.metricID, std::move(*payload)));
         }
         for (const std::string& line : issues) faults_.once(line);
     }
@@ -523,13 +483,13 @@ class ModemManagerBaseband::Poller {
                 due.push_back(item.metricID);
             }
         }
-        const std::uint64_t now = wallClockMs();
+        const std::uint64_t now = sim::wallClockMs();
         FieldIssues issues;
         for (const std::int64_t id : due) {
             const ModemKind* kind = findModemKind(id);
             if (kind == nullptr) continue;
             if (auto payload = kind->write(reading_, now, issues))
-                sink_(velk::kEventMetric, metricEvent(id, std::move(*payload)));
+                sink_(velk::kEventMetric, sim::metricEvent(id, std::move(*payload)));
         }
         for (const std::string& line : issues) faults_.once(line);
     }
@@ -598,28 +558,20 @@ ModemManagerBaseband::~ModemManagerBaseband() {
 velk::Result ModemManagerBaseband::performCommand(const std::string& command, const Value& input,
                                                   Value* output) {
     static_cast<void>(output);  // no command has a reply object
-    if (!input.isDict()) return badInput("the command's input is not a dictionary");
-    const Dict& dict = input.asDict();
-    if (!intAt(dict, velk::kKeyAppID)) return badInput("kKeyAppID is missing or not an integer");
+    auto checked = sim::commandInput(input);
+    if (auto* refused = std::get_if<velk::Result>(&checked)) return std::move(*refused);
+    const Dict& dict = *std::get<const Dict*>(checked);
 
     if (command == velk::kCommandAddConfiguration) {
-        const Value* payload = dict.find(velk::kKeyPayload);
-        if (!payload || !payload->isBytes()) return badInput("kKeyPayload is missing or not bytes");
-        const Bytes& bytes = payload->asBytes();
-        sim::DeviceConfig config;
-        try {
-            config = sim::parseDeviceConfig(
-                std::string_view(reinterpret_cast<const char*>(bytes.data()), bytes.size()));
-        } catch (const sim::ConfigurationError& error) {
-            return velk::Result(velk::kCodeBadConfiguration, error.what());
-        }
+        auto parsed = sim::parseConfiguration(dict);
+        if (auto* refused = std::get_if<velk::Result>(&parsed)) return std::move(*refused);
+        const sim::DeviceConfig& config = std::get<sim::DeviceConfig>(parsed);
         std::vector<Shared::Due> schedule;
         milliseconds period = options_.defaultPeriod;
         bool any = false;
         for (const auto& item : config.metrics) {
             if (findModemKind(item.id) == nullptr) continue;
-            const milliseconds itemPeriod{
-                std::max<std::uint64_t>(item.periodMs, kShortestPeriod.count())};
+            const milliseconds itemPeriod{item.periodMs};
             schedule.push_back({item.id, itemPeriod, Clock::now()});
             period = any ? std::min(period, itemPeriod) : itemPeriod;
             any = true;
@@ -649,21 +601,15 @@ velk::Result ModemManagerBaseband::performCommand(const std::string& command, co
         return velk::Result(velk::kCodeSuccess, "configuration cleared");
     }
     if (command == velk::kCommandQueryMetric) {
-        const auto metricID = intAt(dict, velk::kKeyMetricID);
-        const auto triggerID = intAt(dict, velk::kKeyTriggerID);
-        if (!metricID) return badInput("kKeyMetricID is missing or not an integer");
-        if (!triggerID) return badInput("kKeyTriggerID is missing or not an integer");
-        Query query;
-        query.triggerID = *triggerID;
-        query.triggerRef = intAt(dict, velk::kKeyTriggerRef).value_or(0);
-        query.triggerType = intAt(dict, velk::kKeyTriggerType).value_or(0);
-        query.profileID = intAt(dict, velk::kKeyProfileID).value_or(0);
-        query.metricID =
-            *metricID == 0 && *triggerID == kSimFilesTriggerID ? kSimFilesMetricID : *metricID;
+        auto parsed = sim::parseQuery(dict);
+        if (auto* refused = std::get_if<velk::Result>(&parsed)) return std::move(*refused);
+        sim::MetricQuery query = std::get<sim::MetricQuery>(parsed);
+        const std::int64_t asked = query.metricID;
+        query.metricID = sim::answeringMetric(query);
         if (findModemKind(query.metricID) == nullptr)
             return velk::Result(velk::kCodeUnknownMetric,
                                 format("metric 0x%llX is not one the modem source reports",
-                                       static_cast<unsigned long long>(*metricID)));
+                                       static_cast<unsigned long long>(asked)));
         {
             const std::lock_guard lock(shared_->mutex);
             shared_->queries.push_back(query);

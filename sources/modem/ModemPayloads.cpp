@@ -9,7 +9,9 @@
 #include "core/Format.h"
 #include "core/MetricKindList.h"
 #include "messages/Messages.h"
+#include "sources/sim/BasebandCommands.h"
 #include "sources/sim/Identities.h"
+#include "sources/sim/SimFiles.h"
 
 namespace pyx::modem {
 
@@ -343,13 +345,6 @@ std::optional<Bytes> activeBearers(const ModemReading& r, std::uint64_t timestam
     return m.data();
 }
 
-std::shared_ptr<ElementaryFile> file(std::uint32_t id, Bytes content) {
-    auto ef = std::make_shared<ElementaryFile>();
-    ef->setEfId(id);
-    ef->setContent(std::move(content));
-    return ef;
-}
-
 std::optional<Bytes> simFiles(const ModemReading& r, std::uint64_t timestamp, FieldIssues&) {
     if (!r.sim.has(F::SimIccid) && !r.sim.has(F::SimImsi)) return std::nullopt;
     return simFilesPayload(r, timestamp);
@@ -377,7 +372,7 @@ constexpr std::array kKinds = {
     ModemKind{id::K_CELLULAR_ACTIVE_BEARER, activeBearers},
     ModemKind{id::K_SIM_FILE_INFO, simFiles},
 };
-static_assert(id::K_SIM_FILE_INFO == kSimFilesMetricID);
+static_assert(id::K_SIM_FILE_INFO == sim::kSimFilesMetricID);
 
 }  // namespace
 
@@ -394,10 +389,13 @@ const ModemKind* findModemKind(std::int64_t metricID) {
 Bytes simFilesPayload(const ModemReading& r, std::uint64_t timestamp) {
     KCellularSimCardFiles m;
     m.setTimestamp(timestamp);
-    if (const Bytes* iccid = r.sim.bytes(F::SimIccid)) m.addEfList(file(0x2FE2, *iccid));
-    if (const Bytes* imsi = r.sim.bytes(F::SimImsi)) m.addEfList(file(0x6F07, *imsi));
+    if (const Bytes* iccid = r.sim.bytes(F::SimIccid))
+        m.addEfList(sim::elementaryFile(sim::kEfIccid, *iccid));
+    if (const Bytes* imsi = r.sim.bytes(F::SimImsi))
+        m.addEfList(sim::elementaryFile(sim::kEfImsi, *imsi));
     if (const auto digits = r.sim.number(F::SimMncDigits))
-        m.addEfList(file(0x6FAD, Bytes{0x00, 0x00, 0x00, static_cast<std::uint8_t>(*digits)}));
+        m.addEfList(
+            sim::elementaryFile(sim::kEfAd, sim::adContent(static_cast<std::uint32_t>(*digits))));
     return m.data();
 }
 

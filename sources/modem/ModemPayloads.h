@@ -24,8 +24,8 @@ struct ModemKind {
 [[nodiscard]] std::span<const ModemKind> modemKinds();
 [[nodiscard]] const ModemKind* findModemKind(std::int64_t metricID);
 
-// The SIM files kind, also written (possibly without files) when the SIM is asked for.
-inline constexpr std::int64_t kSimFilesMetricID = 0x3C0013;
+// The SIM files kind (sim::kSimFilesMetricID), also written (possibly without files) when the
+// SIM is asked for.
 [[nodiscard]] Bytes simFilesPayload(const ModemReading& reading, std::uint64_t timestamp);
 
 }  // namespace pyx::modem

@@ -8,6 +8,7 @@
 #include "sources/sim/Identities.h"
 #include "sources/sim/PayloadHelpers.h"
 #include "sources/sim/Payloads.h"
+#include "sources/sim/SimFiles.h"
 
 namespace pyx::sim::payloads {
 
@@ -63,13 +64,6 @@ Bytes ipv6Address(const Subscriber& sub, std::uint8_t subnet) {
     appendBigEndian(a, sub.mTmsi, 4);
     appendBigEndian(a, sub.pTmsi, 4);
     return a;
-}
-
-std::shared_ptr<ElementaryFile> file(std::uint32_t id, Bytes content) {
-    auto ef = std::make_shared<ElementaryFile>();
-    ef->setEfId(id);
-    ef->setContent(std::move(content));
-    return ef;
 }
 
 }  // namespace
@@ -191,26 +185,26 @@ Bytes simCardFiles(const DriveState& s, std::uint64_t timestamp, Random&) {
     KCellularSimCardFiles m;
     m.setTimestamp(timestamp);
 
-    m.addEfList(file(0x2FE2, encodeIccid(sub.iccid)));      // ICCID
-    m.addEfList(file(0x6F07, encodeImsi(sub.imsi, true)));  // IMSI
+    m.addEfList(elementaryFile(kEfIccid, encodeIccid(sub.iccid)));
+    m.addEfList(elementaryFile(kEfImsi, encodeImsi(sub.imsi, true)));
 
     Bytes spn{0x01};  // display condition, then the name, F-padded to 16 characters
     const std::string name = "Pyxon Test";
     spn.insert(spn.end(), name.begin(), name.end());
     spn.resize(17, 0xFF);
-    m.addEfList(file(0x6F46, std::move(spn)));  // SPN
+    m.addEfList(elementaryFile(0x6F46, std::move(spn)));  // SPN
 
-    m.addEfList(file(0x6FAD, Bytes{0x00, 0x00, 0x00, static_cast<std::uint8_t>(sub.mncDigits)}));
+    m.addEfList(elementaryFile(kEfAd, adContent(sub.mncDigits)));
 
     const int accessClass = sub.imsi.back() - '0';
-    m.addEfList(
-        file(0x6F78, Bytes{static_cast<std::uint8_t>(accessClass >= 8 ? 1 << (accessClass - 8) : 0),
-                           static_cast<std::uint8_t>(accessClass < 8 ? 1 << accessClass : 0)}));
-    m.addEfList(file(0x6F31, Bytes{0x05}));  // HPPLMN search period: 30 minutes
+    m.addEfList(elementaryFile(
+        0x6F78, Bytes{static_cast<std::uint8_t>(accessClass >= 8 ? 1 << (accessClass - 8) : 0),
+                      static_cast<std::uint8_t>(accessClass < 8 ? 1 << accessClass : 0)}));
+    m.addEfList(elementaryFile(0x6F31, Bytes{0x05}));  // HPPLMN search period: 30 minutes
 
     Bytes fplmn = encodePlmn(sub.mcc, sub.mnc + 2, sub.mncDigits);
     fplmn.resize(12, 0xFF);
-    m.addEfList(file(0x6F7B, std::move(fplmn)));  // FPLMN
+    m.addEfList(elementaryFile(0x6F7B, std::move(fplmn)));  // FPLMN
 
     Bytes loci;  // TMSI, LAI, TMSI time, update status
     appendBigEndian(loci, sub.tmsi, 4);
@@ -218,7 +212,7 @@ Bytes simCardFiles(const DriveState& s, std::uint64_t timestamp, Random&) {
     appendBigEndian(loci, s.umtsLac, 2);
     loci.push_back(0xFF);
     loci.push_back(0x00);
-    m.addEfList(file(0x6F7E, std::move(loci)));
+    m.addEfList(elementaryFile(0x6F7E, std::move(loci)));
 
     Bytes psloci;  // P-TMSI, P-TMSI signature, RAI, update status
     appendBigEndian(psloci, sub.pTmsi, 4);
@@ -227,7 +221,7 @@ Bytes simCardFiles(const DriveState& s, std::uint64_t timestamp, Random&) {
     appendBigEndian(psloci, s.umtsLac, 2);
     psloci.push_back(static_cast<std::uint8_t>(kRac));
     psloci.push_back(0x00);
-    m.addEfList(file(0x6F73, std::move(psloci)));
+    m.addEfList(elementaryFile(0x6F73, std::move(psloci)));
 
     Bytes epsloci{0x0B, 0xF6};  // GUTI, last visited TAI, EPS update status
     append(epsloci, plmn);
@@ -237,7 +231,7 @@ Bytes simCardFiles(const DriveState& s, std::uint64_t timestamp, Random&) {
     append(epsloci, plmn);
     appendBigEndian(epsloci, s.tac, 2);
     epsloci.push_back(0x00);
-    m.addEfList(file(0x6FE3, std::move(epsloci)));
+    m.addEfList(elementaryFile(0x6FE3, std::move(epsloci)));
     return m.data();
 }
 

@@ -5,6 +5,7 @@
 #include <stdexcept>
 #include <string_view>
 #include <utility>
+#include <variant>
 
 #include "baseband/velk/Names.h"
 #include "core/Format.h"
@@ -13,26 +14,11 @@ namespace pyx::sim {
 
 namespace {
 
-std::uint64_t wallClockMs() {
-    return static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::milliseconds>(
-                                          std::chrono::system_clock::now().time_since_epoch())
-                                          .count());
-}
-
 double checkedSpeed(double speed) {
     if (!(speed > 0.0) || !std::isfinite(speed))
         throw std::invalid_argument(
             format("the simulated baseband's speed must be a positive number, not %g", speed));
     return speed;
-}
-
-std::optional<std::int64_t> intAt(const Dict& input, const char* key) {
-    const Value* value = input.find(key);
-    return value ? value->toInt64() : std::nullopt;
-}
-
-velk::Result badInput(const char* what) {
-    return velk::Result(velk::kCodeBadInput, what);
 }
 
 }  // namespace
@@ -51,9 +37,9 @@ SimulatedBaseband::~SimulatedBaseband() {
 velk::Result SimulatedBaseband::performCommand(const std::string& command, const Value& input,
                                                Value* output) {
     static_cast<void>(output);  // no command has a reply object
-    if (!input.isDict()) return badInput("the command's input is not a dictionary");
-    const Dict& dict = input.asDict();
-    if (!intAt(dict, velk::kKeyAppID)) return badInput("kKeyAppID is missing or not an integer");
+    auto checked = commandInput(input);
+    if (auto* refused = std::get_if<velk::Result>(&checked)) return std::move(*refused);
+    const Dict& dict = *std::get<const Dict*>(checked);
     if (command == velk::kCommandAddConfiguration) return addConfiguration(dict);
     if (command == velk::kCommandClearConfiguration) {
         const std::lock_guard lock(timelineMutex_);
@@ -65,12 +51,10 @@ velk::Result SimulatedBaseband::performCommand(const std::string& command, const
 }
 
 velk::Result SimulatedBaseband::addConfiguration(const Dict& input) {
-    const Value* payload = input.find(velk::kKeyPayload);
-    if (!payload || !payload->isBytes()) return badInput("kKeyPayload is missing or not bytes");
-    const Bytes& bytes = payload->asBytes();
+    auto parsed = parseConfiguration(input);
+    if (auto* refused = std::get_if<velk::Result>(&parsed)) return std::move(*refused);
+    DeviceConfig config = std::move(std::get<DeviceConfig>(parsed));
     try {
-        DeviceConfig config = parseDeviceConfig(
-            std::string_view(reinterpret_cast<const char*>(bytes.data()), bytes.size()));
         for (const auto& item : config.metrics) {
             if (!Drive::reports(item.id))
                 throw ConfigurationError(item.line,
@@ -92,21 +76,14 @@ velk::Result SimulatedBaseband::addConfiguration(const Dict& input) {
 }
 
 velk::Result SimulatedBaseband::queryMetric(const Dict& input) {
-    const auto metricID = intAt(input, velk::kKeyMetricID);
-    const auto triggerID = intAt(input, velk::kKeyTriggerID);
-    if (!metricID) return badInput("kKeyMetricID is missing or not an integer");
-    if (!triggerID) return badInput("kKeyTriggerID is missing or not an integer");
-    MetricQuery query;
-    query.metricID = *metricID;
-    query.triggerID = *triggerID;
-    query.triggerRef = intAt(input, velk::kKeyTriggerRef).value_or(0);
-    query.triggerType = intAt(input, velk::kKeyTriggerType).value_or(0);
-    query.profileID = intAt(input, velk::kKeyProfileID).value_or(0);
+    auto parsed = parseQuery(input);
+    if (auto* refused = std::get_if<velk::Result>(&parsed)) return std::move(*refused);
+    const MetricQuery& query = std::get<MetricQuery>(parsed);
     const std::lock_guard lock(timelineMutex_);
     if (!timeline_.query(query))
         return velk::Result(velk::kCodeUnknownMetric,
                             format("metric 0x%llX is not one this baseband reports",
-                                   static_cast<unsigned long long>(*metricID)));
+                                   static_cast<unsigned long long>(query.metricID)));
     return velk::Result(velk::kCodeSuccess, "Success");
 }
 

@@ -25,9 +25,7 @@ void Timeline::clear() {
 }
 
 bool Timeline::query(const MetricQuery& query) {
-    const std::int64_t metricID = query.metricID == 0 && query.triggerID == kSimFilesTriggerID
-                                      ? kSimFilesMetricID
-                                      : query.metricID;
+    const std::int64_t metricID = answeringMetric(query);
     if (!Drive::reports(metricID)) return false;
     answers_.push_back(
         Answer{triggerEvent(query.triggerID, query.triggerRef, query.triggerType, query.profileID),
@@ -60,23 +58,15 @@ std::vector<SimEvent> Timeline::step() {
 }
 
 SimEvent Timeline::metricEvent(std::int64_t metricID) {
-    Bytes payload = drive_.payload(metricID, nowMs()).value_or(Bytes{});
-    Dict event;
-    event.append(velk::kKeyMetricID, Value(metricID));
-    event.append(velk::kKeyPayload, Value(std::move(payload)));
-    event.append(velk::kKeyPayloadType, Value(std::int64_t{0}));
-    event.append(velk::kKeyProfileID, Value(std::int64_t{0}));
-    return SimEvent{velk::kEventMetric, Value(std::move(event))};
+    return SimEvent{
+        velk::kEventMetric,
+        sim::metricEvent(metricID, drive_.payload(metricID, nowMs()).value_or(Bytes{}))};
 }
 
 SimEvent Timeline::triggerEvent(std::int64_t triggerID, std::int64_t triggerRef,
                                 std::int64_t triggerType, std::int64_t profileID) const {
-    Dict event;
-    event.append(velk::kKeyTriggerID, Value(triggerID));
-    event.append(velk::kKeyTriggerRef, Value(triggerRef));
-    event.append(velk::kKeyTriggerType, Value(triggerType));
-    event.append(velk::kKeyProfileID, Value(profileID));
-    return SimEvent{velk::kEventTrigger, Value(std::move(event))};
+    return SimEvent{velk::kEventTrigger,
+                    sim::triggerEvent(triggerID, triggerRef, triggerType, profileID)};
 }
 
 }  // namespace pyx::sim

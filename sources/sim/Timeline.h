@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "core/Value.h"
+#include "sources/sim/BasebandCommands.h"
 #include "sources/sim/DeviceConfig.h"
 #include "sources/sim/Drive.h"
 
@@ -22,19 +23,6 @@ struct SimEvent {
     Value object;
     friend bool operator==(const SimEvent&, const SimEvent&) = default;
 };
-
-// A query as the manager sends it.
-struct MetricQuery {
-    std::int64_t triggerRef = 0;
-    std::int64_t triggerType = 0;
-    std::int64_t triggerID = 0;
-    std::int64_t profileID = 0;
-    std::int64_t metricID = 0;
-};
-
-// The trigger ID with which the SIM files are asked for (with metric ID 0).
-inline constexpr std::int64_t kSimFilesTriggerID = 0x7F0013;
-inline constexpr std::int64_t kSimFilesMetricID = 0x3C0013;
 
 class Timeline {
   public:
