@@ -226,10 +226,12 @@ class ModemManagerBaseband::Poller {
                             "ModemManager is not running (no org.freedesktop.ModemManager1 on the "
                             "system D-Bus): start it with 'sudo systemctl start ModemManager'; "
                             "waiting for it");
+                loseModem();
             } else {
+                // A lost connection drops the modem with it; anything else (a late answer)
+                // only skips this poll.
                 callFailed("GetManagedObjects", e);
             }
-            loseModem();
             return std::nullopt;
         }
         faults_.clear("call GetManagedObjects");
@@ -291,7 +293,8 @@ class ModemManagerBaseband::Poller {
         signalRate_.reset();
         signalRefused_ = false;
         cellInfoUnavailable_ = false;
-        for (const char* topic : {"setup", "cells"}) faults_.clear(topic);
+        locationUnavailable_ = false;
+        for (const char* topic : {"setup", "cells", "location"}) faults_.clear(topic);
     }
 
     void setUpSignal(const std::string& path, milliseconds period) {
@@ -437,8 +440,9 @@ class ModemManagerBaseband::Poller {
         } catch (const sdbus::Error& e) {
             if (refused(e) || unsupported(e)) {
                 locationUnavailable_ = true;
-                faults_.once("ModemManager Location.GetLocation on " + path + " refused (" +
-                             e.getName() + "); the cell's area and identity stay unknown");
+                faults_.say("location", "ModemManager Location.GetLocation on " + path +
+                                            " refused (" + e.getName() +
+                                            "); the cell's area and identity stay unknown");
             } else {
                 callFailed("Location.GetLocation", e);
             }

@@ -87,6 +87,14 @@ void FakeModemManager::removeModem(std::uint32_t index) {
         .withArguments(index);
 }
 
+void FakeModemManager::stall(std::chrono::milliseconds duration) {
+    sdbus::createProxy(*connection_, kService, kRoot)
+        ->callMethod("Stall")
+        .onInterface(kMock)
+        .withTimeout(kCallTimeout)
+        .withArguments(static_cast<double>(duration.count()) / 1000.0);
+}
+
 void FakeModemManager::setLteRsrp(double rsrp) {
     sdbus::createProxy(*connection_, kService, kRoot)
         ->callMethod("SetLteRsrp")

@@ -33,6 +33,8 @@ class FakeModemManager {
     void addModem(const std::string& scenario, std::uint32_t index);
     void removeModem(std::uint32_t index);
     void setLteRsrp(double rsrp);
+    // The service answers nothing for that long, from just after the call.
+    void stall(std::chrono::milliseconds duration);
 
   private:
     bool serviceOwned();

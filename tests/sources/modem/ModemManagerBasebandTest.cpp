@@ -184,6 +184,20 @@ TEST_F(ModemSource, AMethodThatTimesOutIsSaidOnceAndTheRestIsStillShown) {
     EXPECT_EQ(modem.shown("LTE", "Serving Cell Meas", "rsrp0"), "-97");
 }
 
+TEST_F(ModemSource, ALateAnswerToTheModemListKeepsTheModemAndWhatItRefused) {
+    fake.start(R"({"scenario": "refusing"})");
+    modem.start();
+    ASSERT_TRUE(showsRsrp("-97"));
+    ASSERT_TRUE(modem.waitForLog("ModemManager refused GetCellInfo"));
+    fake.stall(std::chrono::milliseconds(3000));  // the transport waits 2 s at most
+    ASSERT_TRUE(modem.waitForLog("ModemManager did not answer GetManagedObjects within 2000 ms"));
+    const int polls = modem.metricEvents(kRsrpRsrqSinr);
+    ASSERT_TRUE(modem.waitFor([&] { return modem.metricEvents(kRsrpRsrqSinr) >= polls + 3; }));
+    EXPECT_EQ(modem.logLines("using the modem /org/freedesktop/ModemManager1/Modem/0"), 1);
+    EXPECT_EQ(modem.logLines("ModemManager refused Signal.Setup"), 1);
+    EXPECT_EQ(modem.logLines("ModemManager refused GetCellInfo"), 1);
+}
+
 TEST_F(ModemSource, WrongTypesAndMalformedStringsAreLeftOutWithOneLineEach) {
     fake.start(R"({"scenario": "malformed"})");
     modem.start();

@@ -11,7 +11,8 @@ Parameters (JSON, all optional):
   delay      how long the slow GetCellInfo takes (default 3.0 seconds)
 
 Mock methods (org.freedesktop.DBus.Mock): AddModem(scenario, index), RemoveModem(index),
-SetLteRsrp(rsrp).
+SetLteRsrp(rsrp), Stall(seconds): the service answers nothing for that long, from just after
+this call returns.
 '''
 
 import time
@@ -180,6 +181,15 @@ def RemoveModem(self, index):
         path = f'{MAIN_OBJ}/{kind}/{index}'
         if path in mockobject.objects:
             self.RemoveObject(path)
+
+
+@dbus.service.method(MOCK_IFACE, in_signature='d', out_signature='',
+                     async_callbacks=('done', 'failed'))
+def Stall(self, seconds, done, failed):
+    del failed
+    done()
+    self.connection.flush()
+    time.sleep(seconds)
 
 
 @dbus.service.method(MOCK_IFACE, in_signature='d', out_signature='')
