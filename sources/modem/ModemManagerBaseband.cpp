@@ -129,11 +129,11 @@ class ModemManagerBaseband::Poller {
                                     e.what() + "; trying again");
         }
         if (!read) {
-            answerQueries();
+            answerQueries(false);
             return options_.retryPeriod;
         }
         if (stop.stop_requested()) return milliseconds{0};
-        answerQueries();
+        answerQueries(true);
         emitDue();
         return period;
     }
@@ -294,6 +294,8 @@ class ModemManagerBaseband::Poller {
         signalRefused_ = false;
         cellInfoUnavailable_ = false;
         locationUnavailable_ = false;
+        reading_ = {};
+        haveReading_ = false;
         for (const char* topic : {"setup", "cells", "location"}) faults_.clear(topic);
     }
 
@@ -453,7 +455,9 @@ class ModemManagerBaseband::Poller {
             facts.location.append("3gpp", toValue(it->second));
     }
 
-    void answerQueries() {
+    // Answers the waiting queries: with the trigger, and the metric when this poll read the
+    // modem (fresh); a poll that read nothing has no values to give.
+    void answerQueries(bool fresh) {
         std::deque<sim::MetricQuery> queries;
         {
             const std::lock_guard lock(shared_.mutex);
@@ -464,10 +468,11 @@ class ModemManagerBaseband::Poller {
         for (const sim::MetricQuery& q : queries) {
             sink_(velk::kEventTrigger,
                   sim::triggerEvent(q.triggerID, q.triggerRef, q.triggerType, q.profileID));
+            if (!fresh || !haveReading_) continue;
             std::optional<Bytes> payload;
             if (q.metricID == sim::kSimFilesMetricID) {
                 payload = simFilesPayload(reading_, now);
-            } else if (const ModemKind* kind = findModemKind(q.metricID); kind && haveReading_) {
+            } else if (const ModemKind* kind = findModemKind(q.metricID)) {
                 payload = kind->write(reading_, now, issues);
             }
             if (payload)

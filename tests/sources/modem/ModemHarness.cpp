@@ -60,8 +60,9 @@ void ModemHarness::start() {
                                    Value(command({{velk::kKeyPayload, Value(bytes)}})), nullptr);
     ASSERT_TRUE(pushed.ok()) << pushed.message;
     transport_->startEvents([this](const std::string& event, Value object) {
-        if (event != velk::kEventMetric || !object.isDict()) return;
         const std::lock_guard lock(mutex_);
+        if (event == velk::kEventTrigger) ++triggers_;
+        if (event != velk::kEventMetric || !object.isDict()) return;
         pending_.push_back(std::move(object.asDict()));
     });
 }
@@ -118,6 +119,11 @@ int ModemHarness::logLines(const std::string& part) const {
     return static_cast<int>(std::count_if(lines.begin(), lines.end(), [&](const std::string& l) {
         return l.find(part) != std::string::npos;
     }));
+}
+
+int ModemHarness::triggerEvents() const {
+    const std::lock_guard lock(mutex_);
+    return triggers_;
 }
 
 int ModemHarness::metricEvents(std::int64_t metricID) const {

@@ -48,6 +48,7 @@ class ModemHarness {
     // The system log lines that contain part.
     [[nodiscard]] int logLines(const std::string& part) const;
     [[nodiscard]] int metricEvents(std::int64_t metricID) const;
+    [[nodiscard]] int triggerEvents() const;
 
     modem::ModemManagerBaseband& transport() { return *transport_; }
     MetricValidator& store() { return *store_; }
@@ -61,6 +62,7 @@ class ModemHarness {
     mutable std::mutex mutex_;
     std::vector<Dict> pending_;
     std::vector<std::int64_t> seen_;
+    int triggers_ = 0;  // under mutex_
 };
 
 }  // namespace pyx::test

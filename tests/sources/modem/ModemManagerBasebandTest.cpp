@@ -2,6 +2,8 @@
 // the screens show once the transport's events have gone through the store.
 #include <gtest/gtest.h>
 
+#include <thread>
+
 #include "FakeModemManager.h"
 #include "ModemHarness.h"
 
@@ -9,6 +11,7 @@ namespace pyx::test {
 namespace {
 
 constexpr std::int64_t kRsrpRsrqSinr = 0x3C4F6A;
+constexpr std::int64_t kSimFiles = 0x3C0013;
 
 class ModemSource : public ::testing::Test {
   protected:
@@ -106,6 +109,23 @@ TEST_F(ModemSource, ModemRemovedAndAddedAgainIsPickedUpAgain) {
     ASSERT_TRUE(showsRsrp("-88"));
     EXPECT_EQ(modem.logLines("using the modem /org/freedesktop/ModemManager1/Modem/0"), 2);
     EXPECT_EQ(modem.logLines("is gone"), 1);
+}
+
+TEST_F(ModemSource, AQueryWhileTheModemIsGoneIsAnsweredWithoutItsLastValues) {
+    fake.start(R"({"scenario": "mbim"})");
+    modem.start();
+    modem.querySimFiles();
+    ASSERT_TRUE(modem.waitFor([&] { return modem.metricEvents(kSimFiles) > 0; }));
+
+    fake.removeModem(0);
+    ASSERT_TRUE(modem.waitForLog("the modem /org/freedesktop/ModemManager1/Modem/0 is gone"));
+    const int triggers = modem.triggerEvents();
+    const int files = modem.metricEvents(kSimFiles);
+    modem.querySimFiles();
+    ASSERT_TRUE(modem.waitFor([&] { return modem.triggerEvents() > triggers; }));
+    std::this_thread::sleep_for(std::chrono::milliseconds(500));
+    ASSERT_TRUE(modem.waitFor([] { return true; }));
+    EXPECT_EQ(modem.metricEvents(kSimFiles), files);
 }
 
 TEST_F(ModemSource, ServiceStoppedAndStartedAgainMidRunIsReattached) {
