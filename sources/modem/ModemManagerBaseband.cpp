@@ -43,6 +43,7 @@ constexpr char kBearer[] = "org.freedesktop.ModemManager1.Bearer";
 constexpr std::uint32_t kLocation3gppLacCi = 1;
 
 constexpr milliseconds kWaitSlice{50};
+constexpr std::chrono::seconds kSimRereadPeriod{30};
 
 bool nameIs(const sdbus::Error& e, std::initializer_list<std::string_view> names) {
     return std::find(names.begin(), names.end(), e.getName()) != names.end();
@@ -167,7 +168,10 @@ class ModemManagerBaseband::Poller {
             connection_ = sdbus::createSystemBusConnection();
             manager_ = sdbus::createProxy(*connection_, kService, kRootPath);
             manager_->registerSignalHandler(kObjectManager, "InterfacesAdded",
-                                            [this](sdbus::Signal&) { rescan_ = true; });
+                                            [this](sdbus::Signal&) {
+                                                rescan_ = true;
+                                                simStale_ = true;
+                                            });
             manager_->registerSignalHandler(kObjectManager, "InterfacesRemoved",
                                             [this](sdbus::Signal&) { rescan_ = true; });
             manager_->finishRegistration();
@@ -296,6 +300,7 @@ class ModemManagerBaseband::Poller {
         locationUnavailable_ = false;
         reading_ = {};
         haveReading_ = false;
+        forgetSim();
         for (const char* topic : {"setup", "cells", "location"}) faults_.clear(topic);
     }
 
@@ -376,9 +381,7 @@ class ModemManagerBaseband::Poller {
         facts.signalUmts = dictionaryProperty(interfaces, kSignal, "Umts", "Signal.Umts");
         facts.signalGsm = dictionaryProperty(interfaces, kSignal, "Gsm", "Signal.Gsm");
 
-        if (const Value* sim = facts.modem.find("Sim");
-            sim && sim->isString() && sim->asString() != "/")
-            if (auto properties = getAll(sim->asString(), kSim)) facts.sim = toDict(*properties);
+        readSim(facts);
         if (const Value* bearers = facts.modem.find("Bearers"); bearers && bearers->isArray()) {
             for (const Value& bearer : bearers->asArray()) {
                 if (!bearer.isString()) continue;
@@ -393,6 +396,32 @@ class ModemManagerBaseband::Poller {
         reading_ = readModem(facts, issues);
         for (const std::string& line : issues) faults_.once(line);
         haveReading_ = true;
+    }
+
+    // The SIM's properties hardly change: read again only for another SIM, when ModemManager
+    // says an object came, or after kSimRereadPeriod.
+    void readSim(ModemFacts& facts) {
+        const Value* sim = facts.modem.find("Sim");
+        if (!sim || !sim->isString() || sim->asString() == "/") {
+            forgetSim();
+            return;
+        }
+        const std::string& path = sim->asString();
+        if (path != simPath_ || simStale_ || Clock::now() - simReadAt_ >= kSimRereadPeriod) {
+            forgetSim();
+            simStale_ = false;
+            if (auto properties = getAll(path, kSim)) {
+                simFacts_ = toDict(*properties);
+                simPath_ = path;
+                simReadAt_ = Clock::now();
+            }
+        }
+        facts.sim = simFacts_;
+    }
+
+    void forgetSim() {
+        simPath_.clear();
+        simFacts_ = {};
     }
 
     void readCells(const std::string& path, ModemFacts& facts) {
@@ -548,6 +577,10 @@ class ModemManagerBaseband::Poller {
     std::uint64_t generation_ = 0;
     ModemReading reading_;
     bool haveReading_ = false;
+    std::string simPath_;  // the SIM whose properties simFacts_ holds; empty: none read
+    Dict simFacts_;
+    Clock::time_point simReadAt_;
+    bool simStale_ = false;
 };
 
 ModemManagerBaseband::ModemManagerBaseband(Options options)
