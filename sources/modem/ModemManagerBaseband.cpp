@@ -99,13 +99,14 @@ class ModemManagerBaseband::Poller {
     Poller(const ModemManagerBaseband::Options& options, ModemManagerBaseband::Shared& shared)
         : options_(options), shared_(shared) {}
 
-    // Polls until stop, handing events to sink.
+    // Polls until stop, handing events to sink; then puts the modem's signal rate back.
     void run(const std::stop_token& stop, velk::client::Transport::EventSink sink) {
         sink_ = std::move(sink);
         while (!stop.stop_requested()) {
             const milliseconds wait = cycle(stop);
             sleep(stop, wait);
         }
+        restoreSignal();
     }
 
   private:
@@ -148,7 +149,7 @@ class ModemManagerBaseband::Poller {
             const auto path = chooseModem(*objects);
             if (!path) return false;
             const Interfaces& interfaces = objects->at(sdbus::ObjectPath(*path));
-            setUpSignal(*path, period);
+            setUpSignal(*path, interfaces, period);
             readModemFacts(*path, interfaces);
             faults_.clear("poll");
             return true;
@@ -277,6 +278,7 @@ class ModemManagerBaseband::Poller {
         }
         const std::string path = kModemPathPrefix + std::to_string(*chosen);
         if (modem_ != path) {
+            restoreSignal();
             loseModem();
             modem_ = path;
             const Properties& modem = objects.at(sdbus::ObjectPath(path)).at(kModem);
@@ -291,10 +293,29 @@ class ModemManagerBaseband::Poller {
         return path;
     }
 
+    // Sets the modem's signal rate back to what it was before this source set it up.
+    void restoreSignal() {
+        const auto original = std::exchange(originalRate_, std::nullopt);
+        const auto current = std::exchange(signalRate_, std::nullopt);
+        if (!connection_ || !modem_ || !original || !current || *original == *current) return;
+        try {
+            proxy(*modem_)
+                .callMethod("Setup")
+                .onInterface(kSignal)
+                .withTimeout(options_.callTimeout)
+                .withArguments(*original);
+        } catch (const sdbus::Error& e) {
+            faults_.say("setup", "ModemManager could not set the signal rate of " + *modem_ +
+                                     " back to " + std::to_string(*original) +
+                                     " s: " + e.getName() + ": " + e.getMessage());
+        }
+    }
+
     // Forgets the modem in use: a modem that comes back is set up afresh.
     void loseModem() {
         modem_.reset();
         signalRate_.reset();
+        originalRate_.reset();
         signalRefused_ = false;
         cellInfoUnavailable_ = false;
         locationUnavailable_ = false;
@@ -304,16 +325,23 @@ class ModemManagerBaseband::Poller {
         for (const char* topic : {"setup", "cells", "location"}) faults_.clear(topic);
     }
 
-    void setUpSignal(const std::string& path, milliseconds period) {
+    void setUpSignal(const std::string& path, const Interfaces& interfaces, milliseconds period) {
         const auto rate =
             static_cast<std::uint32_t>(std::max<long long>(1, (period.count() + 999) / 1000));
         if (signalRefused_ || signalRate_ == rate) return;
+        // The modem's own rate, put back when the source stops.
+        std::optional<std::uint32_t> before;
+        if (const auto i = interfaces.find(kSignal); i != interfaces.end())
+            if (const auto p = i->second.find("Rate"); p != i->second.end())
+                if (const Value v = toValue(p->second); v.isUInt() && v.asUInt() <= 0xFFFFFFFFU)
+                    before = static_cast<std::uint32_t>(v.asUInt());
         try {
             proxy(path)
                 .callMethod("Setup")
                 .onInterface(kSignal)
                 .withTimeout(options_.callTimeout)
                 .withArguments(rate);
+            if (!signalRate_) originalRate_ = before;
             signalRate_ = rate;
             faults_.clear("call Signal.Setup");
         } catch (const sdbus::Error& e) {
@@ -570,7 +598,8 @@ class ModemManagerBaseband::Poller {
     bool rescan_ = false;
 
     std::optional<std::string> modem_;
-    std::optional<std::uint32_t> signalRate_;
+    std::optional<std::uint32_t> signalRate_;    // what this source set up
+    std::optional<std::uint32_t> originalRate_;  // what the modem had before
     bool signalRefused_ = false;
     bool cellInfoUnavailable_ = false;
     bool locationUnavailable_ = false;

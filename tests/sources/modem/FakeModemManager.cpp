@@ -95,6 +95,19 @@ void FakeModemManager::stall(std::chrono::milliseconds duration) {
         .withArguments(static_cast<double>(duration.count()) / 1000.0);
 }
 
+std::uint32_t FakeModemManager::signalRate(std::uint32_t index) {
+    sdbus::Variant rate;
+    sdbus::createProxy(*connection_, kService,
+                       std::string(kRoot) + "/Modem/" + std::to_string(index))
+        ->callMethod("Get")
+        .onInterface("org.freedesktop.DBus.Properties")
+        .withTimeout(kCallTimeout)
+        .withArguments(std::string("org.freedesktop.ModemManager1.Modem.Signal"),
+                       std::string("Rate"))
+        .storeResultsTo(rate);
+    return rate.get<std::uint32_t>();
+}
+
 void FakeModemManager::setLteRsrp(double rsrp) {
     sdbus::createProxy(*connection_, kService, kRoot)
         ->callMethod("SetLteRsrp")

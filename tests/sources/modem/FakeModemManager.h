@@ -35,6 +35,8 @@ class FakeModemManager {
     void setLteRsrp(double rsrp);
     // The service answers nothing for that long, from just after the call.
     void stall(std::chrono::milliseconds duration);
+    // The Signal Rate property of modem index.
+    [[nodiscard]] std::uint32_t signalRate(std::uint32_t index);
 
   private:
     bool serviceOwned();

@@ -160,6 +160,16 @@ TEST_F(ModemSource, ModemNumberChoosesThatModemAndWaitsForOneNotThere) {
     EXPECT_EQ(fifth.metricEvents(kRsrpRsrqSinr), 0);
 }
 
+TEST_F(ModemSource, TheModemsSignalRateIsPutBackWhenTheSourceStops) {
+    fake.start(R"({"scenario": "mbim"})");
+    ASSERT_EQ(fake.signalRate(0), 0U);
+    modem.start();
+    ASSERT_TRUE(showsRsrp("-97"));
+    EXPECT_EQ(fake.signalRate(0), 1U);  // polled every 200 ms: the shortest rate, 1 s
+    modem.transport().stopEvents();
+    EXPECT_EQ(fake.signalRate(0), 0U);
+}
+
 TEST_F(ModemSource, ModemManagerAbsentAtStartIsSaidOnceAndWaitedFor) {
     modem.start();
     ASSERT_TRUE(modem.waitForLog("ModemManager is not running"));

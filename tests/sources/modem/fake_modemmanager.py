@@ -52,6 +52,10 @@ def access_denied(_self, *_args):
         'Not authorized to control the device', name='org.freedesktop.DBus.Error.AccessDenied')
 
 
+def signal_setup(self, rate):
+    self.UpdateProperties(SIGNAL, {'Rate': dbus.UInt32(rate)})
+
+
 def mbim_cells(_self):
     return dbus.Array([
         sv({'cell-type': dbus.UInt32(5), 'serving': True, 'operator-id': '26201', 'tac': '1A2B',
@@ -135,7 +139,7 @@ def add_modem(mock, scenario, index):
         'Gsm': sv({'rssi': 5.0}) if malformed else sv({}),
         'Nr5g': sv({}),
     })
-    setup = access_denied if scenario == 'refusing' else ''
+    setup = access_denied if scenario == 'refusing' else signal_setup
     modem.AddMethods(SIGNAL, [('Setup', 'u', '', setup)])
     modem.AddProperties(LOCATION, {'Capabilities': dbus.UInt32(3), 'Enabled': dbus.UInt32(1)})
     location = malformed_location if malformed else good_location
