@@ -13,24 +13,24 @@ namespace pyx::modem {
 
 class FaultReporter {
   public:
-    using Sink = std::function<void(std::string_view line)>;
-
-    // Lines go to sink; the system log when none is given.
-    explicit FaultReporter(Sink sink = {});
+    // Lines go to the system log.
+    FaultReporter() = default;
 
     // Says line under topic, unless it is the last line the topic said.
     void say(const std::string& topic, const std::string& line);
     // Forgets what topic said: its next line is said whatever it is.
     void clear(const std::string& topic);
-    // Whether topic's last line is still standing.
-    [[nodiscard]] bool saying(const std::string& topic) const;
-    // Says line once for the life of the reporter.
+    // Says line once for the life of the reporter. Lines that differ only in their numbers
+    // (the value a field was given) are one fault, said with the first value; after
+    // kOnceLimit faults, one line says that further ones are not shown.
     void once(const std::string& line);
 
+    static constexpr std::size_t kOnceLimit = 256;
+
   private:
-    Sink sink_;
     std::map<std::string, std::string, std::less<>> last_;
     std::set<std::string, std::less<>> said_;
+    bool full_ = false;
 };
 
 }  // namespace pyx::modem

@@ -6,12 +6,32 @@
 
 #include "FakeModemManager.h"
 #include "ModemHarness.h"
+#include "core/Log.h"
+#include "sources/modem/FaultReporter.h"
 
 namespace pyx::test {
 namespace {
 
 constexpr std::int64_t kRsrpRsrqSinr = 0x3C4F6A;
 constexpr std::int64_t kSimFiles = 0x3C0013;
+
+TEST(FaultReporter, AFaultIsSaidOnceWithItsFirstValueAndTheMemoryIsBounded) {
+    const CapturedLines log(systemLogSink());
+    modem::FaultReporter faults;
+    faults.once("ModemManager Signal.Lte rsrp: -500.0 is out of range -156..-31; left out");
+    faults.once("ModemManager Signal.Lte rsrp: -612.5 is out of range -156..-31; left out");
+    faults.once("ModemManager Signal.Lte rsrq: -500.0 is out of range -43..20; left out");
+    ASSERT_EQ(log.lines().size(), 2U);
+    EXPECT_EQ(log.lines()[0],
+              "ModemManager Signal.Lte rsrp: -500.0 is out of range -156..-31; left out");
+
+    for (int n = 0; n < 1000; ++n)
+        faults.once("fault " + std::string(1, 'a' + n % 26) + "x" +
+                    std::string(static_cast<std::size_t>(n / 26), 'y'));
+    const auto lines = log.lines();
+    ASSERT_EQ(lines.size(), modem::FaultReporter::kOnceLimit + 1);
+    EXPECT_NE(lines.back().find("further faults not shown"), std::string::npos);
+}
 
 class ModemSource : public ::testing::Test {
   protected:
