@@ -12,12 +12,12 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstdio>
 #include <cstdlib>
 #include <string>
 #include <variant>
 #include <vector>
 
-#include "core/Log.h"
 #include "metrics/MetricCatalogue.h"
 #include "sources/modem/ModemPayloads.h"
 #include "sources/sim/BasebandCommands.h"

@@ -79,21 +79,6 @@ using ManagedObjects = std::map<sdbus::ObjectPath, Interfaces>;
 
 }  // namespace
 
-struct ModemManagerBaseband::Shared {
-    struct Due {
-        std::int64_t metricID = 0;
-        milliseconds period{0};
-        Clock::time_point next;
-    };
-    std::mutex mutex;
-    bool configured = false;
-    std::vector<Due> schedule;  // the configured kinds this source writes
-    milliseconds period{0};     // the poll period
-    std::uint64_t generation = 0;
-    std::deque<sim::MetricQuery> queries;
-    std::atomic<bool> wake{false};
-};
-
 class ModemManagerBaseband::Poller {
   public:
     Poller(const ModemManagerBaseband::Options& options, ModemManagerBaseband::Shared& shared)
@@ -612,8 +597,7 @@ class ModemManagerBaseband::Poller {
     bool simStale_ = false;
 };
 
-ModemManagerBaseband::ModemManagerBaseband(Options options)
-    : options_(options), shared_(std::make_shared<Shared>()) {
+ModemManagerBaseband::ModemManagerBaseband(Options options) : options_(options) {
     // sdbus-c++ keeps a process-wide bus for the messages inside variants, made on first use
     // and destroyed at exit in the reverse order of making. Making it now, before the manager
     // that will own this transport, lets it outlive the polling thread, which that manager
@@ -649,13 +633,13 @@ velk::Result ModemManagerBaseband::performCommand(const std::string& command, co
         }
         const std::size_t written = schedule.size();
         {
-            const std::lock_guard lock(shared_->mutex);
-            shared_->configured = true;
-            shared_->schedule = std::move(schedule);
-            shared_->period = period;
-            ++shared_->generation;
+            const std::lock_guard lock(shared_.mutex);
+            shared_.configured = true;
+            shared_.schedule = std::move(schedule);
+            shared_.period = period;
+            ++shared_.generation;
         }
-        shared_->wake = true;
+        shared_.wake = true;
         return velk::Result(
             velk::kCodeSuccess,
             format("configuration accepted: %zu metrics, %zu of them from the "
@@ -664,10 +648,10 @@ velk::Result ModemManagerBaseband::performCommand(const std::string& command, co
     }
     if (command == velk::kCommandClearConfiguration) {
         {
-            const std::lock_guard lock(shared_->mutex);
-            shared_->configured = false;
-            shared_->schedule.clear();
-            ++shared_->generation;
+            const std::lock_guard lock(shared_.mutex);
+            shared_.configured = false;
+            shared_.schedule.clear();
+            ++shared_.generation;
         }
         return velk::Result(velk::kCodeSuccess, "configuration cleared");
     }
@@ -682,10 +666,10 @@ velk::Result ModemManagerBaseband::performCommand(const std::string& command, co
                                 format("metric 0x%llX is not one the modem source reports",
                                        static_cast<unsigned long long>(asked)));
         {
-            const std::lock_guard lock(shared_->mutex);
-            shared_->queries.push_back(query);
+            const std::lock_guard lock(shared_.mutex);
+            shared_.queries.push_back(query);
         }
-        shared_->wake = true;
+        shared_.wake = true;
         return velk::Result(velk::kCodeSuccess, "Success");
     }
     return velk::Result(velk::kCodeUnknownCommand, format("unknown command '%s'", command.c_str()));
@@ -694,7 +678,7 @@ velk::Result ModemManagerBaseband::performCommand(const std::string& command, co
 void ModemManagerBaseband::startEvents(EventSink sink) {
     const std::lock_guard control(controlMutex_);
     stopThread();
-    if (!poller_) poller_ = std::make_unique<Poller>(options_, *shared_);
+    if (!poller_) poller_ = std::make_unique<Poller>(options_, shared_);
     thread_ = std::jthread([poller = poller_.get(), sink = std::move(sink)](
                                const std::stop_token& stop) { poller->run(stop, sink); });
 }

@@ -6,15 +6,19 @@
 // system log.
 #pragma once
 
+#include <atomic>
 #include <chrono>
 #include <cstdint>
+#include <deque>
 #include <memory>
 #include <mutex>
 #include <optional>
 #include <string>
 #include <thread>
+#include <vector>
 
 #include "baseband/velk/Transport.h"
+#include "sources/sim/BasebandCommands.h"
 
 namespace pyx::modem {
 
@@ -41,16 +45,30 @@ class ModemManagerBaseband : public velk::client::Transport {
     // accepted when it parses; its metrics that this source writes are emitted at their
     // periods, the shortest of which sets the poll rate. kCommandClearConfiguration: always
     // succeeds. kCommandQueryMetric: the SIM files (trigger 0x7F0013, metric 0) or a kind this
-    // source writes, answered by a trigger event and the metric at the next poll.
+    // source writes, answered by a trigger event at the next poll, and the metric when that poll
+    // reads the modem.
     velk::Result performCommand(const std::string& command, const Value& input,
                                 Value* output) override;
     void startEvents(EventSink sink) override;
     void stopEvents() override;
 
-    // What the polling thread shares with the caller's thread.
-    struct Shared;
-
   private:
+    // What the polling thread shares with the caller's thread.
+    struct Shared {
+        struct Due {
+            std::int64_t metricID = 0;
+            std::chrono::milliseconds period{0};
+            std::chrono::steady_clock::time_point next;
+        };
+        std::mutex mutex;
+        bool configured = false;
+        std::vector<Due> schedule;            // the configured kinds this source writes
+        std::chrono::milliseconds period{0};  // the poll period
+        std::uint64_t generation = 0;
+        std::deque<sim::MetricQuery> queries;
+        std::atomic<bool> wake{false};
+    };
+
     // The polling thread's state (the bus connection, the modem in use, what it said and what
     // the modem said); it outlives a stop and start of the events, so a restarted thread
     // goes on where the last one stopped.
@@ -59,7 +77,7 @@ class ModemManagerBaseband : public velk::client::Transport {
     void stopThread();
 
     const Options options_;
-    std::shared_ptr<Shared> shared_;
+    Shared shared_;
     std::unique_ptr<Poller> poller_;
     std::mutex controlMutex_;  // serialises starting and stopping the thread
     std::jthread thread_;
