@@ -352,9 +352,11 @@ std::optional<Bytes> simFiles(const ModemReading& r, std::uint64_t timestamp, Fi
 
 // The catalogue's metric IDs, named by their constants.
 namespace id {
-#define PYX_KIND_ID(constant, metricID, ...) constexpr std::int64_t constant = metricID;
-PYX_METRIC_KINDS(PYX_KIND_ID)
+enum MetricID : std::int64_t {
+#define PYX_KIND_ID(constant, metricID, ...) constant = (metricID),
+    PYX_METRIC_KINDS(PYX_KIND_ID)
 #undef PYX_KIND_ID
+};
 }  // namespace id
 
 constexpr std::array kKinds = {
