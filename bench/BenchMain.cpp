@@ -28,7 +28,6 @@ int main(int argc, char** argv) {
     try {
         const auto corpus = pyx::bench::loadCorpus(corpusPath);
         if (!pyx::bench::checkReference(corpus, std::cerr)) return 1;
-        pyx::bench::registerDecodeBenchmarks(corpus);
         pyx::bench::registerCompareBenchmarks(corpus);
         pyx::bench::registerIntakeBenchmarks(corpus);
 #ifdef PYXON_BENCH_RECORDINGS

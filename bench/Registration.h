@@ -22,8 +22,6 @@ struct Subject {
 // ("realistic") and the whole corpus ("corpus", last).
 [[nodiscard]] std::vector<Subject> subjectsOf(const std::vector<CorpusRecord>& corpus);
 
-// Typed decode and bytes to dictionary of one realistic record per decoded kind, ours only.
-void registerDecodeBenchmarks(const std::vector<CorpusRecord>& corpus);
 // Typed decode and bytes to dictionary, ours against libprotobuf.
 void registerCompareBenchmarks(const std::vector<CorpusRecord>& corpus);
 // The intake, the whole event path, and the largest category screen.

@@ -1,5 +1,5 @@
 // How a message class is declared: one field list per class generates its storage, its named
-// accessors and (in the group's .cpp) its descriptor table.
+// accessors and (in messages/MessageDescriptors.cpp) its descriptor table.
 //
 // A field list is a macro taking a consumer F and naming one field per line, by kind:
 //
@@ -22,7 +22,8 @@
 //       PYX_MESSAGE_BODY(RxInfo)
 //   };
 //
-// and the group's .cpp has PYX_DEFINE_MESSAGE(RxInfo) (messages/MessageDefinition.h).
+// and messages/MessageDescriptors.cpp expands PYX_DEFINE_MESSAGE(RxInfo)
+// (messages/MessageDefinition.h) for it, as for every class of messages/MessageClassList.h.
 #pragma once
 
 #include <cstddef>

@@ -1,10 +1,9 @@
 // The one list of message classes: the classes of the metric kinds first, then the nested
 // records. The aggregate header messages/Messages.h is written from it when the project is
-// configured (messages/CMakeLists.txt), the groups' .cpp files define the descriptor tables
-// of their classes from it, and the fuzz table and the every-class tests follow it.
+// configured (messages/CMakeLists.txt), messages/MessageDescriptors.cpp defines the descriptor
+// tables of the classes from it, and the fuzz table and the every-class tests follow it.
 //
-// CLASS(group, Class): Class is declared in messages/<group>/<Class>.h and its descriptor table
-// is defined in that group's .cpp file.
+// CLASS(group, Class): Class is declared in messages/<group>/<Class>.h.
 #pragma once
 
 #include <cstddef>

@@ -1,5 +1,5 @@
 // The descriptor table of a message class, generated from its field list. Included only by
-// the groups' .cpp files: PYX_DEFINE_MESSAGE(Class) once per class.
+// messages/MessageDescriptors.cpp: PYX_DEFINE_MESSAGE(Class) once per class.
 #pragma once
 
 #include <cstddef>

@@ -1,46 +1,27 @@
 // Runs the pyxon program as a new user would, headless on the simulated baseband, and checks
 // what it prints and how it ends.
 #include <gtest/gtest.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 #include <chrono>
-#include <csignal>
 #include <cstdio>
 #include <cstdlib>
 #include <mutex>
 #include <set>
 #include <string>
 #include <thread>
+#include <utility>
 #include <vector>
+
+#include "tests/support/ChildProcess.h"
 
 namespace {
 
-struct Child {
-    pid_t pid = -1;
-    int out = -1;
-    int err = -1;
-};
+using pyx::test::ChildProcess;
 
-Child spawn(const std::vector<std::string>& args) {
-    int outPipe[2];
-    int errPipe[2];
-    if (pipe(outPipe) != 0 || pipe(errPipe) != 0) return {};
-    const pid_t pid = fork();
-    if (pid == 0) {
-        dup2(outPipe[1], STDOUT_FILENO);
-        dup2(errPipe[1], STDERR_FILENO);
-        close(outPipe[0]);
-        close(errPipe[0]);
-        std::vector<char*> argv;
-        for (const auto& a : args) argv.push_back(const_cast<char*>(a.c_str()));
-        argv.push_back(nullptr);
-        execv(argv[0], argv.data());
-        _exit(127);
-    }
-    close(outPipe[1]);
-    close(errPipe[1]);
-    return Child{pid, outPipe[0], errPipe[0]};
+// The program with both its stdout and its stderr on pipes of their own.
+ChildProcess spawn(std::vector<std::string> args) {
+    return ChildProcess(ChildProcess::Options{
+        .argv = std::move(args), .captureStdout = true, .captureStderr = true});
 }
 
 // Reads everything the child writes on one descriptor, in a thread, line by line.
@@ -146,21 +127,21 @@ std::vector<std::string> missingLines(const std::vector<std::string>& lines) {
 }  // namespace
 
 TEST(PyxonHeadless, ShowsEveryKindOnTheSimulatedBasebandAndExitsCleanlyOnSigterm) {
-    Child child = spawn({PYXON_BINARY, "--headless", "--speed", "20"});
-    ASSERT_GT(child.pid, 0);
+    ChildProcess child = spawn({PYXON_BINARY, "--headless", "--speed", "20"});
+    ASSERT_GT(child.pid(), 0);
     std::vector<std::string> out;
     {
-        LineCollector stdoutLines(child.out);
-        LineCollector stderrLines(child.err);
+        LineCollector stdoutLines(child.takeStdout());
+        LineCollector stderrLines(child.takeStderr());
         // Wait, bounded, until everything has shown up (not a timing assertion: a slow machine
         // only takes longer).
-        for (int i = 0; i < 1200 && !missingLines(stdoutLines.lines()).empty(); ++i)
+        for (int i = 0; i < 1200 && child.running() && !missingLines(stdoutLines.lines()).empty();
+             ++i)
             std::this_thread::sleep_for(std::chrono::milliseconds(100));
-        ASSERT_EQ(kill(child.pid, SIGTERM), 0);
-        int status = 0;
-        ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
-        ASSERT_TRUE(WIFEXITED(status)) << "ended by signal " << WTERMSIG(status);
-        EXPECT_EQ(WEXITSTATUS(status), 0);
+        // SIGTERM; SIGKILL if it has not ended 10 s later.
+        const int status = child.terminate();
+        ASSERT_LT(status, 128) << "ended by signal " << status - 128;
+        EXPECT_EQ(status, 0);
         out = stdoutLines.all();
         for (const auto& line : stderrLines.all())
             EXPECT_EQ(line.find("rejected"), std::string::npos) << line;
@@ -170,16 +151,15 @@ TEST(PyxonHeadless, ShowsEveryKindOnTheSimulatedBasebandAndExitsCleanlyOnSigterm
 }
 
 TEST(PyxonOptions, UnknownOptionIsAUsageErrorWithStatusTwo) {
-    Child child = spawn({PYXON_BINARY, "--no-such-option"});
-    ASSERT_GT(child.pid, 0);
+    ChildProcess child = spawn({PYXON_BINARY, "--no-such-option"});
+    ASSERT_GT(child.pid(), 0);
     std::vector<std::string> err;
     {
-        LineCollector o(child.out);
-        LineCollector e(child.err);
-        int status = 0;
-        ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
-        ASSERT_TRUE(WIFEXITED(status));
-        EXPECT_EQ(WEXITSTATUS(status), 2);
+        LineCollector o(child.takeStdout());
+        LineCollector e(child.takeStderr());
+        const int status = child.wait(std::chrono::seconds(60));
+        ASSERT_LT(status, 128) << "ended by signal " << status - 128;
+        EXPECT_EQ(status, 2);
         err = e.all();
     }
     ASSERT_FALSE(err.empty());
@@ -188,16 +168,15 @@ TEST(PyxonOptions, UnknownOptionIsAUsageErrorWithStatusTwo) {
 
 TEST(PyxonOptions, VersionAndHelpExitZero) {
     for (const char* option : {"--version", "--help"}) {
-        Child child = spawn({PYXON_BINARY, option});
-        ASSERT_GT(child.pid, 0);
+        ChildProcess child = spawn({PYXON_BINARY, option});
+        ASSERT_GT(child.pid(), 0);
         std::vector<std::string> out;
         {
-            LineCollector o(child.out);
-            LineCollector e(child.err);
-            int status = 0;
-            ASSERT_EQ(waitpid(child.pid, &status, 0), child.pid);
-            ASSERT_TRUE(WIFEXITED(status));
-            EXPECT_EQ(WEXITSTATUS(status), 0) << option;
+            LineCollector o(child.takeStdout());
+            LineCollector e(child.takeStderr());
+            const int status = child.wait(std::chrono::seconds(60));
+            ASSERT_LT(status, 128) << "ended by signal " << status - 128;
+            EXPECT_EQ(status, 0) << option;
             out = o.all();
         }
         ASSERT_FALSE(out.empty()) << option;

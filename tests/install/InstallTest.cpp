@@ -10,16 +10,18 @@
 #include <iterator>
 #include <sstream>
 #include <string>
+#include <thread>
+#include <utility>
 #include <vector>
 
 #include "ProgramRun.h"
-#include "RunningProgram.h"
+#include "tests/support/ChildProcess.h"
 
 namespace {
 
 namespace fs = std::filesystem;
+using pyx::test::ChildProcess;
 using pyx::test::ProgramRun;
-using pyx::test::RunningProgram;
 using namespace std::chrono_literals;
 
 const std::string kAppID = PYXON_APP_ID;
@@ -40,6 +42,31 @@ ProgramRun installInto(const fs::path& prefix) {
 std::string readFile(const fs::path& path) {
     std::ifstream in(path);
     return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+}
+
+// Whether every one of lines is a whole line of text.
+bool hasLines(const std::string& text, const std::vector<std::string>& lines) {
+    for (const auto& wanted : lines) {
+        std::istringstream in(text);
+        bool found = false;
+        for (std::string line; !found && std::getline(in, line);) found = line == wanted;
+        if (!found) return false;
+    }
+    return true;
+}
+
+// Waits, bounded by limit, until every one of lines is a whole line of the file out, which
+// program writes; true if they all came. Stops waiting when program has ended. Not a timing
+// assertion: a slow machine only takes longer.
+bool waitForLines(ChildProcess& program, const fs::path& out, const std::vector<std::string>& lines,
+                  std::chrono::seconds limit) {
+    const auto deadline = std::chrono::steady_clock::now() + limit;
+    while (true) {
+        const bool ended = !program.running();
+        if (hasLines(readFile(out), lines)) return true;
+        if (ended || std::chrono::steady_clock::now() > deadline) return false;
+        std::this_thread::sleep_for(std::chrono::milliseconds(100));
+    }
 }
 
 // The subcommands that a program's --help lists under "Subcommands:".
@@ -79,6 +106,18 @@ class Installed : public ::testing::Test {
 
     static fs::path program(const std::string& name) { return prefix_ / "bin" / name; }
 
+    // Starts args in the background, in root_, its stdout and stderr written to files there.
+    static ChildProcess startInRoot(std::vector<std::string> args) {
+        return ChildProcess(ChildProcess::Options{.argv = std::move(args),
+                                                  .stderrFile = (root_ / "stderr.txt").string(),
+                                                  .stdoutFile = stdoutFile().string(),
+                                                  .workDir = root_.string()});
+    }
+    static fs::path stdoutFile() { return root_ / "stdout.txt"; }
+    static std::string outputs() {
+        return readFile(stdoutFile()) + "\nstderr:\n" + readFile(root_ / "stderr.txt");
+    }
+
     static inline fs::path root_;
     static inline fs::path prefix_;
     static inline ProgramRun install_;
@@ -86,11 +125,12 @@ class Installed : public ::testing::Test {
 
 TEST_F(Installed, PyxonHeadlessFindsTheInstalledBundleAndEndsWithStatusZeroOnSigterm) {
     // Started outside the source tree, so that only the installed bundle can be found.
-    RunningProgram pyxon({program("pyxon").string(), "--headless", "--speed", "20"}, root_);
-    ASSERT_TRUE(pyxon.started());
-    EXPECT_TRUE(pyxon.waitForLines(
-        {"pushing metric file", "Querying SIM files", "Received Valid Metric"}, 60s))
-        << pyxon.output();
+    ChildProcess pyxon = startInRoot({program("pyxon").string(), "--headless", "--speed", "20"});
+    ASSERT_GT(pyxon.pid(), 0);
+    EXPECT_TRUE(waitForLines(pyxon, stdoutFile(),
+                             {"pushing metric file", "Querying SIM files", "Received Valid Metric"},
+                             60s))
+        << outputs();
     EXPECT_EQ(pyxon.terminate(), 0);
 }
 
@@ -100,10 +140,11 @@ TEST_F(Installed, PyxonLooksForItsMetricFileUnderItsOwnPrefix) {
     const fs::path bare = root_ / "bare";
     ASSERT_EQ(installInto(bare).exitCode, 0);
     ASSERT_TRUE(fs::remove(bare / "share/pyxon/oru_test_lte.deviceconfig"));
-    RunningProgram pyxon({(bare / "bin/pyxon").string(), "--headless"}, root_);
-    ASSERT_TRUE(pyxon.started());
-    EXPECT_TRUE(pyxon.waitForLines({"Metric Log File path doesnt exist"}, 60s)) << pyxon.output();
-    EXPECT_EQ(pyxon.output().find("pushing metric file"), std::string::npos);
+    ChildProcess pyxon = startInRoot({(bare / "bin/pyxon").string(), "--headless"});
+    ASSERT_GT(pyxon.pid(), 0);
+    EXPECT_TRUE(waitForLines(pyxon, stdoutFile(), {"Metric Log File path doesnt exist"}, 60s))
+        << outputs();
+    EXPECT_EQ(readFile(stdoutFile()).find("pushing metric file"), std::string::npos);
     EXPECT_EQ(pyxon.terminate(), 0);
 }
 

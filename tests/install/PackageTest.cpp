@@ -24,6 +24,13 @@ class DebianPackage : public ::testing::Test {
             GTEST_SKIP() << "dpkg-deb not found: cannot read the package";
         if (!fs::is_regular_file(kPackage))
             GTEST_SKIP() << "no package at " << kPackage << ": `scripts/dev package` builds it";
+        // Nothing rebuilds the package when the programs change: an older one would be tested
+        // for what this build no longer is.
+        const fs::path program = PYXON_BINARY;
+        if (fs::last_write_time(kPackage) < fs::last_write_time(program))
+            FAIL() << "the package " << kPackage << " is older than this build's " << program
+                   << ": it does not hold the programs built now; rebuild it with "
+                      "`scripts/dev package`";
     }
 };
 

@@ -133,8 +133,8 @@ TEST(MessageReader, FailingNestedRecordFailsTheContainer) {
 }
 
 TEST(MessageReader, EndGroupInsideNestedRecordEndsOnlyThatRecord) {
-    // The RxInfo stops at its end-group key; the container goes on after the mark is recalled,
-    // from where the nested reader stopped (here: the rest of the record, field 2 = 9).
+    // The RxInfo stops at its end-group key; the container takes its sub-reader back and goes
+    // on from where the nested reader stopped (here: the rest of the record, field 2 = 9).
     const Bytes in = bytes({0x1A, 0x05, 0x08, 0x02, 0x0C, 0x10, 0x09, 0x08, 0x04});
     const auto m = KCellularLteServingCellMeasurement::initWithData(in);
     ASSERT_TRUE(m.has_value());

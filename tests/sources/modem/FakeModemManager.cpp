@@ -19,8 +19,9 @@ constexpr auto kCallTimeout = std::chrono::seconds(10);
 }  // namespace
 
 FakeModemManager::FakeModemManager() {
-    bus_ = std::make_unique<ChildProcess>(ChildProcess::Options{
-        {"dbus-daemon", "--session", "--nofork", "--print-address=1"}, {}, true, {}, {}});
+    bus_ = std::make_unique<ChildProcess>(
+        ChildProcess::Options{.argv = {"dbus-daemon", "--session", "--nofork", "--print-address=1"},
+                              .captureStdout = true});
     const auto line = bus_->readLine(std::chrono::seconds(30));
     if (!line || line->empty()) throw std::runtime_error("dbus-daemon printed no address");
     address_ = *line;
@@ -47,12 +48,9 @@ bool FakeModemManager::serviceOwned() {
 
 void FakeModemManager::start(const std::string& parameters) {
     service_ = std::make_unique<ChildProcess>(
-        ChildProcess::Options{{"/usr/bin/python3", "-m", "dbusmock", "--system", "-t",
-                               PYXON_FAKE_MODEMMANAGER, "-p", parameters},
-                              {{"DBUS_SYSTEM_BUS_ADDRESS", address_}},
-                              false,
-                              {},
-                              {}});
+        ChildProcess::Options{.argv = {"/usr/bin/python3", "-m", "dbusmock", "--system", "-t",
+                                       PYXON_FAKE_MODEMMANAGER, "-p", parameters},
+                              .env = {{"DBUS_SYSTEM_BUS_ADDRESS", address_}}});
     const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(60);
     while (!serviceOwned()) {
         if (!service_->running()) throw std::runtime_error("the fake ModemManager did not start");

@@ -10,7 +10,7 @@
 
 #include <sdbus-c++/IConnection.h>
 
-#include "ChildProcess.h"
+#include "tests/support/ChildProcess.h"
 
 namespace pyx::test {
 

@@ -32,8 +32,9 @@ class ModemPrograms : public ::testing::Test {
     // (-1 when part never came).
     int exitCodeOnSigterm(const std::vector<std::string>& argv, const std::string& busAddress,
                           const std::string& part, const std::function<void()>& thenDo = {}) {
-        ChildProcess program(ChildProcess::Options{
-            argv, {{"DBUS_SYSTEM_BUS_ADDRESS", busAddress}}, false, stderrFile, {}});
+        ChildProcess program(ChildProcess::Options{.argv = argv,
+                                                   .env = {{"DBUS_SYSTEM_BUS_ADDRESS", busAddress}},
+                                                   .stderrFile = stderrFile});
         if (!waitForStderr(part)) {
             ADD_FAILURE() << argv[0] << " never said \"" << part << "\"; it said:\n"
                           << readFile(stderrFile);
@@ -97,13 +98,12 @@ TEST_F(ModemPrograms, PyxonctlListenExitsZeroOnSigtermInEveryState) {
 TEST_F(ModemPrograms, ListenPipedIntoScreenShowsTheModemsServingCell) {
     fake.start(R"({"scenario": "mbim"})");
     ChildProcess pipeline(ChildProcess::Options{
-        {"/bin/sh", "-c",
-         "\"$PYXONCTL\" listen --source modem --count 10 | \"$PYXONCTL\" screen LTE 'Serving "
-         "Cell Meas'"},
-        {{"PYXONCTL", PYXONCTL}, {"DBUS_SYSTEM_BUS_ADDRESS", fake.busAddress()}},
-        true,
-        stderrFile,
-        {}});
+        .argv = {"/bin/sh", "-c",
+                 "\"$PYXONCTL\" listen --source modem --count 10 | \"$PYXONCTL\" screen LTE "
+                 "'Serving Cell Meas'"},
+        .env = {{"PYXONCTL", PYXONCTL}, {"DBUS_SYSTEM_BUS_ADDRESS", fake.busAddress()}},
+        .captureStdout = true,
+        .stderrFile = stderrFile});
     const auto screen = pipeline.readLine(std::chrono::seconds(60));
     ASSERT_TRUE(screen) << readFile(stderrFile);
     EXPECT_NE(screen->find(R"({"text":"phy_cell_id","detail":"303"})"), std::string::npos)

@@ -9,6 +9,7 @@
 
 #include <stdexcept>
 #include <thread>
+#include <utility>
 
 extern char** environ;
 
@@ -43,18 +44,25 @@ ChildProcess::ChildProcess(Options options) {
     std::vector<char*> argv = pointers(args);
     std::vector<char*> envp = pointers(env);
 
-    int pipeFds[2] = {-1, -1};
-    if (options.captureStdout && ::pipe2(pipeFds, O_CLOEXEC) != 0)
+    int outPipe[2] = {-1, -1};
+    int errPipe[2] = {-1, -1};
+    if (options.captureStdout && ::pipe2(outPipe, O_CLOEXEC) != 0)
         throw std::runtime_error("pipe failed");
+    if (options.captureStderr && ::pipe2(errPipe, O_CLOEXEC) != 0)
+        throw std::runtime_error("pipe failed");
+    const int inFd = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
     const int outFd =
         options.captureStdout
-            ? pipeFds[1]
+            ? outPipe[1]
             : ::open(options.stdoutFile.empty() ? "/dev/null" : options.stdoutFile.c_str(),
                      O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
     const int errFd =
-        options.stderrFile.empty()
-            ? -1
-            : ::open(options.stderrFile.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
+        options.captureStderr
+            ? errPipe[1]
+            : (options.stderrFile.empty() ? -1
+                                          : ::open(options.stderrFile.c_str(),
+                                                   O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644));
+    const char* workDir = options.workDir.empty() ? nullptr : options.workDir.c_str();
     const pid_t parent = ::getpid();
     pid_ = ::fork();
     if (pid_ < 0) throw std::runtime_error("fork failed");
@@ -63,23 +71,32 @@ ChildProcess::ChildProcess(Options options) {
         ::prctl(PR_SET_PDEATHSIG, SIGKILL);
         if (::getppid() != parent) ::_exit(127);
         ::setpgid(0, 0);
+        if (workDir != nullptr && ::chdir(workDir) != 0) ::_exit(127);
+        if (inFd >= 0) ::dup2(inFd, 0);
         if (outFd >= 0) ::dup2(outFd, 1);
         if (errFd >= 0) ::dup2(errFd, 2);
         ::execvpe(argv[0], argv.data(), envp.data());
         ::_exit(127);
     }
-    if (options.captureStdout) {
-        ::close(pipeFds[1]);
-        stdout_ = pipeFds[0];
-    } else if (outFd >= 0) {
-        ::close(outFd);
-    }
+    if (inFd >= 0) ::close(inFd);
+    if (outFd >= 0) ::close(outFd);
     if (errFd >= 0) ::close(errFd);
+    stdout_ = outPipe[0];
+    stderr_ = errPipe[0];
 }
 
 ChildProcess::~ChildProcess() {
     terminate(std::chrono::seconds(5));
     if (stdout_ >= 0) ::close(stdout_);
+    if (stderr_ >= 0) ::close(stderr_);
+}
+
+int ChildProcess::takeStdout() {
+    return std::exchange(stdout_, -1);
+}
+
+int ChildProcess::takeStderr() {
+    return std::exchange(stderr_, -1);
 }
 
 std::optional<std::string> ChildProcess::readLine(std::chrono::milliseconds timeout) {
