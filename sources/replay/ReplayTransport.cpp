@@ -136,8 +136,14 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
             });
         } catch (const recordings::RecordingError& e) {
             systemLog(format("replay %s; the replay stops here", e.what()));
-            const std::lock_guard lock(mutex_);
-            finished_ = true;
+            bool say = false;
+            {
+                const std::lock_guard lock(mutex_);
+                finished_ = true;
+                say = !endSaid_;
+                endSaid_ = true;
+            }
+            if (say && options_.onEnd) options_.onEnd(true);
             return;
         }
         if (stopped) return;
@@ -173,7 +179,7 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
             if (options_.loop)
                 systemLog(
                     format("replay %s: the recording holds no events", options_.file.c_str()));
-            if (say && options_.onEnd) options_.onEnd();
+            if (say && options_.onEnd) options_.onEnd(false);
             return;
         }
     }

@@ -491,6 +491,20 @@ TEST(RecordingPrograms, InfoExportAndReplayOfABadFileExitNonZeroWithOneLine) {
     }
 }
 
+TEST(RecordingPrograms, ListenOnADamagedRecordingEndsAndExitsNonZero) {
+    const TempDir dir;
+    const std::string file = dir.file("cut.pyxrec");
+    recordSimulatedDrive(file, 3000);
+    std::filesystem::resize_file(file, std::filesystem::file_size(file) / 2);
+    // --duration only bounds a run that would otherwise never end.
+    const Outcome replay =
+        program("listen --source 'replay:" + file + "' --speed 0 --duration 120");
+    EXPECT_EQ(replay.status, 1) << replay.err;
+    EXPECT_NE(replay.err.find("replay " + file + ": damaged "), std::string::npos) << replay.err;
+    EXPECT_NE(replay.err.find("; the replay stops here\n"), std::string::npos) << replay.err;
+    EXPECT_FALSE(linesOf(replay.out).empty());
+}
+
 TEST(RecordingPrograms, ListenRecordsWhatItPrintsAndAReplayPrintsTheSameAgain) {
     const TempDir dir;
     const std::string file = dir.file("drive.pyxrec");

@@ -244,7 +244,10 @@ TEST(Replay, AtTheEndItSaysSoOnceAndHandsOutNothingMore) {
     ReplayTransport::Options options;
     options.file = file;
     options.speed = 0;
-    options.onEnd = [&] { ++ends; };
+    options.onEnd = [&](bool damaged) {
+        EXPECT_FALSE(damaged);
+        ++ends;
+    };
     ReplayTransport replay(options);
     replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
     Collector collector;
@@ -288,6 +291,34 @@ TEST(Replay, WithLoopItStartsAgainFromTheFirstEventAndSaysTheEndOnce) {
                             }),
               1);
     EXPECT_FALSE(replay.finished());
+}
+
+TEST(Replay, AnEmptyRecordingWithLoopIsOverAtOnceAndSaysSo) {
+    const pyx::CapturedLines log(pyx::systemLogSink());
+    const TempDir dir;
+    const std::string file = dir.file("empty.pyxrec");
+    writeSamples(file, 0);
+    std::atomic<int> ends{0};
+    ReplayTransport::Options options;
+    options.file = file;
+    options.speed = 0;
+    options.loop = true;
+    options.onEnd = [&](bool damaged) {
+        EXPECT_FALSE(damaged);
+        ++ends;
+    };
+    ReplayTransport replay(options);
+    replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+    Collector collector;
+    replay.startEvents(collector.sink());
+    ASSERT_TRUE(waitUntil([&] { return replay.finished(); }));
+    replay.stopEvents();
+    EXPECT_TRUE(collector.events().empty());
+    EXPECT_EQ(ends, 1);
+    const auto lines = log.lines();
+    EXPECT_EQ(std::count(lines.begin(), lines.end(),
+                         "replay " + file + ": the recording holds no events"),
+              1);
 }
 
 TEST(Replay, EventsFlowOnceAConfigurationIsPushedAndARestartGoesOnWhereItWas) {
@@ -343,14 +374,23 @@ TEST(Replay, ADamagedRecordingPlaysWhatCanBeReadThenSaysWhereItBrokeOff) {
     }
     std::filesystem::resize_file(file, std::filesystem::file_size(file) / 2);
     const pyx::CapturedLines log(pyx::systemLogSink());
+    std::atomic<int> ends{0};
+    std::atomic<int> damagedEnds{0};
     ReplayTransport::Options options;
     options.file = file;
     options.speed = 0;
+    options.onEnd = [&](bool damaged) {
+        ++ends;
+        if (damaged) ++damagedEnds;
+    };
     ReplayTransport replay(options);
     replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
     Collector collector;
     replay.startEvents(collector.sink());
     ASSERT_TRUE(waitUntil([&] { return replay.finished(); }));
+    replay.stopEvents();
+    EXPECT_EQ(ends, 1);
+    EXPECT_EQ(damagedEnds, 1);
     const auto events = collector.events();
     ASSERT_GT(events.size(), 500u);
     ASSERT_LT(events.size(), 3000u);
