@@ -311,11 +311,15 @@ int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err
     const auto time = [&](const std::optional<std::string>& text, const char* option,
                           std::optional<std::int64_t>& into) {
         if (!text) return true;
-        into = parseIsoTime(*text);
-        if (!into)
-            err << "pyxonctl export: " << option << " '" << *text
-                << "' is not a time; example: 2026-11-23T19:05:50Z (UTC without a zone)\n";
-        return into.has_value();
+        IsoTimeRefusal refusal = IsoTimeRefusal::NotATime;
+        into = parseIsoTime(*text, &refusal);
+        if (into) return true;
+        err << "pyxonctl export: " << option << " '" << *text;
+        if (refusal == IsoTimeRefusal::OutOfRange)
+            err << "' is outside the times a recording can hold, " << isoTimeRange() << '\n';
+        else
+            err << "' is not a time; example: 2026-11-23T19:05:50Z (UTC without a zone)\n";
+        return false;
     };
     if (!time(request.from, "--from", filter.fromNs) || !time(request.to, "--to", filter.toNs))
         return 2;

@@ -8,6 +8,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <limits>
 #include <nlohmann/json.hpp>
 #include <set>
 #include <sstream>
@@ -170,6 +171,68 @@ TEST(IsoTime, TimesAreWrittenInUtcWithNanosecondsAndReadBackInTheFormsGiven) {
     EXPECT_FALSE(pyx::parseIsoTime("yesterday"));
     EXPECT_FALSE(pyx::parseIsoTime("2026-13-01"));
     EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21:18Zjunk"));
+}
+
+TEST(IsoTime, DatesThatDoNotExistAndZonesOutOfRangeAreNotTimes) {
+    pyx::IsoTimeRefusal refusal = pyx::IsoTimeRefusal::OutOfRange;
+    EXPECT_FALSE(pyx::parseIsoTime("2026-02-31", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::NotATime);
+    EXPECT_FALSE(pyx::parseIsoTime("2026-02-29"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-04-31"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-00-10"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-01-00"));
+    EXPECT_EQ(pyx::parseIsoTime("2024-02-29"), 1'709'164'800'000'000'000);
+    EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21+24:00"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21+02:60"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21-99:00"));
+    EXPECT_EQ(pyx::parseIsoTime("2026-11-23T19:21-23:59"),
+              1'795'461'660'000'000'000 + 86'340'000'000'000);
+}
+
+TEST(IsoTime, TimesBeyondWhatNanosecondsSince1970CanHoldAreRefusedAsOutOfRange) {
+    pyx::IsoTimeRefusal refusal = pyx::IsoTimeRefusal::NotATime;
+    EXPECT_FALSE(pyx::parseIsoTime("9999-12-31", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::OutOfRange);
+    refusal = pyx::IsoTimeRefusal::NotATime;
+    EXPECT_FALSE(pyx::parseIsoTime("0001-01-01", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::OutOfRange);
+    // The last and the first nanosecond that fit, and one past each.
+    constexpr auto kMax = std::numeric_limits<std::int64_t>::max();
+    constexpr auto kMin = std::numeric_limits<std::int64_t>::min();
+    EXPECT_EQ(pyx::isoTime(kMax), "2262-04-11T23:47:16.854775807Z");
+    EXPECT_EQ(pyx::isoTime(kMin), "1677-09-21T00:12:43.145224192Z");
+    EXPECT_EQ(pyx::parseIsoTime("2262-04-11T23:47:16.854775807Z"), kMax);
+    EXPECT_EQ(pyx::parseIsoTime("1677-09-21T00:12:43.145224192Z"), kMin);
+    EXPECT_FALSE(pyx::parseIsoTime("2262-04-11T23:47:16.854775808Z", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::OutOfRange);
+    EXPECT_FALSE(pyx::parseIsoTime("1677-09-21T00:12:43.145224191Z"));
+    EXPECT_EQ(pyx::isoTimeRange(),
+              "1677-09-21T00:12:43.145224192Z to 2262-04-11T23:47:16.854775807Z");
+}
+
+TEST(ExportCommand, ATimeOutOfRangeOrADateThatDoesNotExistIsRefusedWithOneLine) {
+    const TempDir dir;
+    const std::string file = dir.file("drive.pyxrec");
+    {
+        RecordingWriter writer(writerOptions(file));
+        writer.add(velk::kEventMetric, sampleEvent(0));
+    }
+    pyx::ExportRequest request;
+    request.file = file;
+    request.from = "9999-12-31";
+    Outcome run = exportOf(request);
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.err,
+              "pyxonctl export: --from '9999-12-31' is outside the times a recording can hold, "
+              "1677-09-21T00:12:43.145224192Z to 2262-04-11T23:47:16.854775807Z\n");
+    request.from.reset();
+    request.to = "2026-02-31";
+    run = exportOf(request);
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.err,
+              "pyxonctl export: --to '2026-02-31' is not a time; example: 2026-11-23T19:05:50Z "
+              "(UTC without a zone)\n");
 }
 
 TEST(CsvText, FieldsWithCommasQuotesOrLineBreaksAreQuotedAsRfc4180Has) {
