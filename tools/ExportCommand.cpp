@@ -334,8 +334,14 @@ int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err
         err << "pyxonctl export: " << e.what() << '\n';
         return 1;
     }
-    return request.format == "csv" ? exportCsv(*reader, filter, out, err)
-                                   : exportJsonl(*reader, filter, out, err);
+    const int status = request.format == "csv" ? exportCsv(*reader, filter, out, err)
+                                               : exportJsonl(*reader, filter, out, err);
+    // A full disk or a closed pipe: what was asked for did not all get out.
+    if (!out) {
+        err << "pyxonctl export: writing the output failed\n";
+        return 1;
+    }
+    return status;
 }
 
 Subcommand addExportCommand(CLI::App& pyxonctl) {

@@ -400,6 +400,22 @@ TEST(ExportCommand, EachBadFileGivesOneLineNamingItAndANonZeroExit) {
     }
 }
 
+TEST(ExportCommand, AnOutputThatCannotBeWrittenIsSaidAndExitsNonZero) {
+    const TempDir dir;
+    const std::string file = dir.file("drive.pyxrec");
+    {
+        RecordingWriter writer(writerOptions(file));
+        for (int n = 0; n < 10; ++n) writer.add(velk::kEventMetric, sampleEvent(n));
+    }
+    pyx::ExportRequest request;
+    request.file = file;
+    std::ofstream full("/dev/full");
+    ASSERT_TRUE(full.is_open());
+    std::ostringstream err;
+    EXPECT_EQ(pyx::runExport(request, full, err), 1);
+    EXPECT_EQ(err.str(), "pyxonctl export: writing the output failed\n");
+}
+
 TEST(ExportCommand, ADamagedFileExportsWhatCanBeReadAndSaysHowMuch) {
     const TempDir dir;
     const std::string file = dir.file("cut.pyxrec");
@@ -566,6 +582,23 @@ TEST(RecordingPrograms, ListenOnADamagedRecordingEndsAndExitsNonZero) {
     EXPECT_NE(replay.err.find("replay " + file + ": damaged "), std::string::npos) << replay.err;
     EXPECT_NE(replay.err.find("; the replay stops here\n"), std::string::npos) << replay.err;
     EXPECT_FALSE(linesOf(replay.out).empty());
+}
+
+TEST(RecordingPrograms, ExportToAFullDiskSaysSoAndExitsNonZero) {
+    const TempDir dir;
+    const std::string file = dir.file("drive.pyxrec");
+    {
+        RecordingWriter writer(writerOptions(file));
+        for (int n = 0; n < 100; ++n) writer.add(velk::kEventMetric, sampleEvent(n));
+    }
+    for (const char* format : {"jsonl", "csv"}) {
+        const Outcome run = program("export '" + file + "' --format " + format + " > /dev/full");
+        EXPECT_EQ(run.status, 1) << format;
+        // csv says first which of the sample records the store refused.
+        EXPECT_TRUE(run.err.ends_with("\npyxonctl export: writing the output failed\n") ||
+                    run.err == "pyxonctl export: writing the output failed\n")
+            << run.err;
+    }
 }
 
 TEST(RecordingPrograms, ListenRecordsWhatItPrintsAndAReplayPrintsTheSameAgain) {
