@@ -104,16 +104,21 @@ TEST(RecordingFailure, AFileSizeLimitStopsTheRecordingWithOneLineAndTheFileStill
         options.commitInterval = std::chrono::milliseconds(20);
         RecordingWriter writer(options);
         const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(60);
+        std::uint64_t added = 0;
         for (std::int64_t n = 0; !writer.counts().stopped; ++n) {
             if (std::chrono::steady_clock::now() > deadline) _exit(3);
             writer.add(velk::kEventMetric, sampleEvent(n, 200));
+            ++added;
             if (n % 10 == 9) std::this_thread::sleep_for(std::chrono::milliseconds(1));
         }
         // The recording has stopped; the program goes on and closes normally.
         writer.add(velk::kEventMetric, sampleEvent(0));
+        ++added;
         writer.close();
         std::fflush(stderr);
-        _exit(0);
+        // Every event added is either in the file or counted as dropped.
+        const auto counts = writer.counts();
+        _exit(counts.recorded + counts.dropped == added ? 0 : 5);
     }
     int status = 0;
     ASSERT_EQ(waitpid(child, &status, 0), child);
@@ -146,6 +151,9 @@ TEST(RecordingFailure, ARemovedFileStopsTheRecordingWithOneLine) {
     EXPECT_TRUE(writer.counts().stopped);
     writer.add(velk::kEventMetric, sampleEvent(20));
     writer.close();
+    // The ten committed to the removed file are lost with it, and the one after the stop.
+    EXPECT_EQ(writer.counts().recorded, 10u);
+    EXPECT_EQ(writer.counts().dropped, 11u);
     const auto lines = log.lines();
     ASSERT_EQ(lines.size(), 1u);
     EXPECT_EQ(lines[0], "recording " + file +
