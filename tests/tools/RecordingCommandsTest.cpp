@@ -24,6 +24,7 @@
 #include "tools/ExportCommand.h"
 #include "tools/InfoCommand.h"
 #include "tools/IsoTime.h"
+#include "tools/MetricIDText.h"
 #include "tools/RecordWriter.h"
 #ifdef PYXON_HAVE_SCREEN_COMMAND
 #include "tools/ScreenCommand.h"
@@ -158,6 +159,21 @@ void writeSamples(const std::string& file, int count) {
     RecordingWriter writer(writerOptions(file));
     for (int n = 0; n < count; ++n)
         writer.add(n % 4 == 3 ? velk::kEventTrigger : velk::kEventMetric, sampleEvent(n));
+}
+
+TEST(RecordWriter, TheMetricIDAndPayloadComeFirstThenTheOtherKeysInTheirOrder) {
+    pyx::MetricRecord record;
+    record.set("kKeyProfileID", pyx::Value(std::int64_t{0}));
+    record.set("kKeyPayload", pyx::Value(pyx::Bytes{0x0a, 0xff}));
+    record.set("odd \"key\"", pyx::Value(std::string("text")));
+    record.set("kKeyMetricID", pyx::Value(std::int64_t{3952132}));
+    record.set("kKeyRatio", pyx::Value(0.5f));
+    EXPECT_EQ(pyx::recordLine(record),
+              "{\"kKeyMetricID\": 3952132, \"kKeyPayload\": \"0aff\", \"kKeyProfileID\": 0, "
+              "\"odd \\\"key\\\"\": \"text\", \"kKeyRatio\": 0.5}");
+    EXPECT_EQ(pyx::recordLine(pyx::MetricRecord{}), "{}");
+    EXPECT_EQ(pyx::metricIDText(std::int64_t{0x3C4E04}), "0x3C4E04");
+    EXPECT_EQ(pyx::metricIDText(std::optional<std::int64_t>{}), "(no metric ID)");
 }
 
 TEST(IsoTime, TimesAreWrittenInUtcWithNanosecondsAndReadBackInTheFormsGiven) {
