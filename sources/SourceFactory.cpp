@@ -4,6 +4,7 @@
 #include <climits>
 #include <string>
 
+#include "baseband/VelkWrapper.h"
 #include "core/MainQueue.h"
 #include "recordings/RecordingError.h"
 #include "recordings/RecordingTransport.h"
@@ -71,8 +72,10 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
                 replayOptions.speed = options.speed;
                 replayOptions.loop = options.loop;
                 replayOptions.onEnd = options.onEnd;
+                // What the client's serial queue and the main queue still hold: the events
+                // handed out that the store has not taken in yet.
                 replayOptions.backlog = options.backlog ? options.backlog : [] {
-                    return MainQueue::shared().pending();
+                    return MainQueue::shared().pending() + VelkWrapper::queue().pending();
                 };
                 return std::make_shared<replay::ReplayTransport>(std::move(replayOptions));
             } catch (const recordings::RecordingError& e) {
