@@ -85,8 +85,7 @@ int runListen(const ListenOptions& options) {
 
     // Set on the replay's thread, read once the main queue has stopped.
     std::atomic<bool> damaged{false};
-    std::shared_ptr<velk::client::Transport> transport;
-    std::shared_ptr<recordings::RecordingWriter> recording;
+    std::optional<ProgramSource> source;
     try {
         sources::SourceOptions sourceOptions;
         sourceOptions.choice = *choice;
@@ -100,15 +99,12 @@ int runListen(const ListenOptions& options) {
             VelkWrapper::queue().post(
                 [&mainQueue] { mainQueue.post([&mainQueue] { mainQueue.stop(); }); });
         };
-        auto source = openProgramSource(std::move(sourceOptions), options.record, options.append,
-                                        PYXON_VERSION);
-        transport = std::move(source.transport);
-        recording = std::move(source.recording);
+        source.emplace(openProgramSource(std::move(sourceOptions), options.record, options.append,
+                                         PYXON_VERSION));
     } catch (const sources::SourceError& e) {
         std::cerr << "pyxonctl listen: " << e.what() << "\n";
         return 2;
     }
-    velk::client::SetTransportFactory([transport] { return transport; });
 
     const auto printer = std::make_shared<EventPrinter>(mainQueue, options.count);
     const auto client = VelkWrapper::create(mainQueue);
@@ -129,10 +125,7 @@ int runListen(const ListenOptions& options) {
     }
     mainQueue.run();
     client->setDelegate({});
-    // The source's thread stops here, before exit destroys the queues it posts events to.
-    transport->stopEvents();
-    // What is still queued for the recording is written before the process ends.
-    if (recording) recording->close();
+    source->close();
     return damaged ? 1 : 0;
 }
 
