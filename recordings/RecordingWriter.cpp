@@ -388,8 +388,4 @@ RecordingWriter::Counts RecordingWriter::counts() const {
     return state_->counts;
 }
 
-const std::string& RecordingWriter::path() const {
-    return state_->options.path;
-}
-
 }  // namespace pyx::recordings
