@@ -67,11 +67,6 @@ void ReplayTransport::stopThread() {
     thread_.join();
 }
 
-std::uint64_t ReplayTransport::played() const {
-    const std::lock_guard lock(mutex_);
-    return played_;
-}
-
 bool ReplayTransport::finished() const {
     const std::lock_guard lock(mutex_);
     return finished_;
@@ -79,9 +74,12 @@ bool ReplayTransport::finished() const {
 
 bool ReplayTransport::waitForRoom(const std::stop_token& stop) {
     if (!options_.backlog) return !stop.stop_requested();
+    // The steady state of a replay as fast as it is taken. A full backlog takes the store
+    // longer than 2 ms to work through, so polling that often keeps it from running dry
+    // without spinning.
     while (options_.backlog() > options_.maxBacklog) {
         std::unique_lock lock(waitMutex_);
-        if (wake_.wait_for(lock, stop, std::chrono::microseconds(200), [] { return false; }) ||
+        if (wake_.wait_for(lock, stop, std::chrono::milliseconds(2), [] { return false; }) ||
             stop.stop_requested())
             return false;
     }

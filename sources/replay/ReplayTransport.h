@@ -52,8 +52,6 @@ class ReplayTransport : public velk::client::Transport {
     void startEvents(EventSink sink) override;
     void stopEvents() override;
 
-    // Events handed to the sink so far (all passes).
-    [[nodiscard]] std::uint64_t played() const;
     // Whether the replay reached the end of the recording (without loop: it is over).
     [[nodiscard]] bool finished() const;
 
