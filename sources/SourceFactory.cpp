@@ -126,7 +126,7 @@ std::string_view recordingHelp() {
     return "Recording (--record FILE, --append):\n"
            "  every event that reaches the client goes, raw and in order, to FILE (an SQLite\n"
            "  database, .pyxrec), written by a thread of its own and committed at least every\n"
-           "  second. An existing FILE is refused unless --append adds a new session to it.\n"
+           "  500 ms. An existing FILE is refused unless --append adds a new session to it.\n"
            "  When writing fails (disk full, read-only folder, file removed) one line says so\n"
            "  and the recording stops; everything else goes on. Should the writer fall 65,536\n"
            "  events behind, later events are dropped and counted until it catches up (said\n"
