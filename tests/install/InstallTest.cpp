@@ -12,8 +12,8 @@
 #include <string>
 #include <vector>
 
-#include "ProgramRun.h"
 #include "RunningProgram.h"
+#include "tests/support/ProgramRun.h"
 
 namespace {
 

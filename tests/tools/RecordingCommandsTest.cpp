@@ -20,6 +20,7 @@
 #include "sources/sim/SimulatedBaseband.h"
 #include "tests/recordings/SampleEvents.h"
 #include "tests/recordings/TempDir.h"
+#include "tests/support/ProgramRun.h"
 #include "tools/CsvText.h"
 #include "tools/ExportCommand.h"
 #include "tools/InfoCommand.h"
@@ -554,21 +555,9 @@ TEST(ExportCommand, ARecordTheStoreRefusesIsSkippedWithOneLineAndCounted) {
 
 // Runs the built pyxonctl; stdout and stderr apart.
 Outcome program(const std::string& arguments) {
-    const TempDir dir;
-    const std::string errPath = dir.file("err.txt");
-    const std::string command =
-        std::string("'") + PYXONCTL_PATH + "' " + arguments + " 2> '" + errPath + "' < /dev/null";
-    Outcome run;
-    std::FILE* pipe = ::popen(command.c_str(), "r");
-    if (pipe == nullptr) return run;
-    char buffer[4096];
-    for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;)
-        run.out.append(buffer, n);
-    const int status = ::pclose(pipe);
-    run.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-    std::ifstream err(errPath);
-    run.err.assign(std::istreambuf_iterator<char>(err), std::istreambuf_iterator<char>());
-    return run;
+    const auto run =
+        pyx::test::ProgramRun::shell(std::string("'") + PYXONCTL_PATH + "' " + arguments);
+    return Outcome{run.exitCode, run.out, run.err};
 }
 
 TEST(RecordingPrograms, InfoExportAndReplayOfABadFileExitNonZeroWithOneLine) {

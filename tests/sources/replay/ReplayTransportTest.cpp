@@ -30,6 +30,7 @@ using pyx::Dict;
 using pyx::Value;
 using pyx::recordings::RecordingWriter;
 using pyx::replay::ReplayTransport;
+using pyx::testing::recordingOptions;
 using pyx::testing::sampleEvent;
 using pyx::testing::sequenceOf;
 using pyx::testing::StreamEvent;
@@ -37,19 +38,10 @@ using pyx::testing::TempDir;
 
 const std::string kConfigPath = std::string(PYXON_RESOURCE_DIR) + "/oru_test_lte.deviceconfig";
 
-RecordingWriter::Options writerOptions(const std::string& file) {
-    RecordingWriter::Options options;
-    options.path = file;
-    options.session.programVersion = "0.1.0";
-    options.session.source = "sim";
-    options.session.host = "testhost";
-    return options;
-}
-
 // A recording of the numbered sample events 0..count-1, spaced by gap.
 void writeSamples(const std::string& file, int count,
                   std::chrono::milliseconds gap = std::chrono::milliseconds(0)) {
-    RecordingWriter writer(writerOptions(file));
+    RecordingWriter writer(recordingOptions(file));
     for (int n = 0; n < count; ++n) {
         if (n > 0 && gap.count() > 0) std::this_thread::sleep_for(gap);
         writer.add(velk::kEventMetric, sampleEvent(n));
@@ -128,7 +120,7 @@ TEST(Replay, RecordThenReplayHandsTheStoreTheSameRecordsInTheSameOrder) {
     pyx::MainQueue mainQueue;
 
     // Live: the simulated baseband, recorded on its way to the client.
-    auto writer = std::make_shared<RecordingWriter>(writerOptions(file));
+    auto writer = std::make_shared<RecordingWriter>(recordingOptions(file));
     pyx::sim::SimulatedBaseband::Options simOptions;
     simOptions.seed = 11;
     simOptions.speed = 200.0;
@@ -369,7 +361,7 @@ TEST(Replay, ADamagedRecordingPlaysWhatCanBeReadThenSaysWhereItBrokeOff) {
     const TempDir dir;
     const std::string file = dir.file("cut.pyxrec");
     {
-        RecordingWriter writer(writerOptions(file));
+        RecordingWriter writer(recordingOptions(file));
         for (int n = 0; n < 3000; ++n) writer.add(velk::kEventMetric, sampleEvent(n, 40));
     }
     std::filesystem::resize_file(file, std::filesystem::file_size(file) / 2);
