@@ -14,7 +14,6 @@
 #include "app/RootNavigationController.h"
 #include "app/StopOnSignal.h"
 #include "baseband/VelkWrapper.h"
-#include "baseband/velk/Client.h"
 #include "core/Format.h"
 #include "core/Log.h"
 #include "core/MainQueue.h"
@@ -154,23 +153,19 @@ int runPyxon(int argc, char** argv) {
 
     const RejectedRecords rejected(MainQueue::shared());
 
-    std::shared_ptr<velk::client::Transport> transport;
-    std::shared_ptr<recordings::RecordingWriter> recording;
+    std::optional<ProgramSource> source;
     try {
         sources::SourceOptions sourceOptions;
         sourceOptions.choice = *sourceChoice;
         sourceOptions.seed = options.seed;
         sourceOptions.speed = options.speed;
         sourceOptions.loop = options.loop;
-        auto source = openProgramSource(std::move(sourceOptions), options.record, options.append,
-                                        PYXON_VERSION);
-        transport = std::move(source.transport);
-        recording = std::move(source.recording);
+        source.emplace(openProgramSource(std::move(sourceOptions), options.record, options.append,
+                                         PYXON_VERSION));
     } catch (const sources::SourceError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;
     }
-    velk::client::SetTransportFactory([transport] { return transport; });
 
     AppDelegate appDelegate;
     appDelegate.applicationDidFinishLaunchingWithOptions(Dict{});
@@ -195,10 +190,7 @@ int runPyxon(int argc, char** argv) {
     status = runHeadless(root);
 #endif
     appDelegate.applicationWillTerminate();
-    // The source's thread stops here, before exit destroys the queues it posts events to.
-    transport->stopEvents();
-    // What is still queued for the recording is written before the process ends.
-    if (recording) recording->close();
+    source->close();
     return status;
 }
 

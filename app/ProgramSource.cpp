@@ -2,24 +2,38 @@
 
 #include <utility>
 
-#include "baseband/VelkWrapper.h"
-#include "core/MainQueue.h"
+#include "baseband/velk/Client.h"
 
 namespace pyx {
+
+ProgramSource::ProgramSource(std::shared_ptr<velk::client::Transport> transport,
+                             std::shared_ptr<recordings::RecordingWriter> recording)
+    : transport_(std::move(transport)), recording_(std::move(recording)) {}
+
+ProgramSource::~ProgramSource() {
+    close();
+}
+
+void ProgramSource::close() {
+    if (transport_) transport_->stopEvents();
+    if (recording_) recording_->close();
+    transport_.reset();
+    recording_.reset();
+}
 
 ProgramSource openProgramSource(sources::SourceOptions options,
                                 const std::optional<std::string>& record, bool append,
                                 const std::string& programVersion) {
-    options.backlog = [] { return MainQueue::shared().pending() + VelkWrapper::queue().pending(); };
-    ProgramSource source{sources::makeTransport(options), nullptr};
+    std::shared_ptr<velk::client::Transport> transport = sources::makeTransport(options);
+    std::shared_ptr<recordings::RecordingWriter> recording;
     if (record) {
-        auto recorded =
-            sources::recordSource(std::move(source.transport), options,
-                                  sources::RecordOptions{*record, append, programVersion});
-        source.transport = std::move(recorded.transport);
-        source.recording = std::move(recorded.writer);
+        auto recorded = sources::recordSource(
+            std::move(transport), options, sources::RecordOptions{*record, append, programVersion});
+        transport = std::move(recorded.transport);
+        recording = std::move(recorded.writer);
     }
-    return source;
+    velk::client::SetTransportFactory([transport] { return transport; });
+    return ProgramSource(std::move(transport), std::move(recording));
 }
 
 }  // namespace pyx

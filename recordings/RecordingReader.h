@@ -48,9 +48,6 @@ class RecordingReader {
     RecordingReader(RecordingReader&&) noexcept;
     RecordingReader& operator=(RecordingReader&&) noexcept;
 
-    [[nodiscard]] const std::string& path() const { return path_; }
-    [[nodiscard]] std::int32_t formatVersion() const { return formatVersion_; }
-
     // Counts, times and kinds of the whole file. Throws RecordingError.
     [[nodiscard]] Summary summary() const;
 

@@ -147,13 +147,15 @@ struct RecordingWriter::State {
         }
     }
 
-    void stop(const std::string& why) {
+    // lost: events taken off the queue that did not make it into the file (the rest of the
+    // batch, and what the open transaction held).
+    void stop(const std::string& why, std::uint64_t lost = 0) {
         std::uint64_t recorded = 0;
         {
             const std::lock_guard lock(mutex);
             stopped = true;
             counts.stopped = true;
-            counts.dropped += queue.size();
+            counts.dropped += lost + queue.size();
             queue.clear();
             committedSeq = queuedSeq;
             recorded = counts.recorded;
@@ -219,15 +221,17 @@ struct RecordingWriter::State {
         std::int64_t sessionID = 0;
         FileIdentity identity;
         std::optional<SqliteDatabase> db;
+        std::optional<SqliteStatement> prepared;
         try {
             db.emplace(open(sessionID, identity));
+            prepared.emplace(db->prepare(
+                "INSERT INTO events(session, stream, wall_ns, mono_ns, metric_id, payload, "
+                "record) VALUES(?, ?, ?, ?, ?, ?, ?)"));
         } catch (const SqliteError& error) {
             stop("cannot open it: " + whyWriteFailed(error, options.path));
             return;
         }
-        SqliteStatement insert = db->prepare(
-            "INSERT INTO events(session, stream, wall_ns, mono_ns, metric_id, payload, record) "
-            "VALUES(?, ?, ?, ?, ?, ?, ?)");
+        SqliteStatement& insert = *prepared;
         EncodedRecord encoded;
         std::deque<Pending> batch;
         bool inTransaction = false;
@@ -251,6 +255,7 @@ struct RecordingWriter::State {
                 flushNow = flushWanted;
                 flushWanted = false;
             }
+            std::size_t written = 0;  // of the batch
             try {
                 for (Pending& event : batch) {
                     if (!inTransaction) {
@@ -277,8 +282,10 @@ struct RecordingWriter::State {
                     insert.step();
                     insert.reset();
                     ++inTransactionCount;
+                    ++written;
                 }
                 batch.clear();
+                written = 0;
                 const bool due =
                     inTransaction && Clock::now() - transactionStart >= options.commitInterval;
                 if (inTransaction && (due || closeNow || flushNow)) {
@@ -286,7 +293,8 @@ struct RecordingWriter::State {
                     inTransaction = false;
                     const auto now = identityOf(options.path);
                     if (!now || now->device != identity.device || now->inode != identity.inode) {
-                        stop("the file was removed or replaced");
+                        // Committed, but to a file that is no longer there to be read.
+                        stop("the file was removed or replaced", inTransactionCount);
                         return;
                     }
                     {
@@ -303,7 +311,9 @@ struct RecordingWriter::State {
                     committed.notify_all();
                 }
             } catch (const SqliteError& error) {
-                stop(whyWriteFailed(error, options.path));
+                // The open transaction is rolled back as the file closes.
+                stop(whyWriteFailed(error, options.path),
+                     inTransactionCount + (batch.size() - written));
                 return;
             }
             if (closeNow && !inTransaction) return;
@@ -376,10 +386,6 @@ void RecordingWriter::close() {
 RecordingWriter::Counts RecordingWriter::counts() const {
     const std::lock_guard lock(state_->mutex);
     return state_->counts;
-}
-
-const std::string& RecordingWriter::path() const {
-    return state_->options.path;
 }
 
 }  // namespace pyx::recordings

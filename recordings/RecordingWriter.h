@@ -59,7 +59,6 @@ class RecordingWriter {
     void close();
 
     [[nodiscard]] Counts counts() const;
-    [[nodiscard]] const std::string& path() const;
 
   private:
     struct State;

@@ -36,8 +36,12 @@ SqliteDatabase& SqliteDatabase::operator=(SqliteDatabase&&) noexcept = default;
 SqliteDatabase::~SqliteDatabase() = default;
 
 SqliteError SqliteDatabase::errorFor(int code, const std::string& what) const {
-    const char* message = db_ ? sqlite3_errmsg(db_.get()) : sqlite3_errstr(code);
-    const int systemErrno = db_ ? sqlite3_system_errno(db_.get()) : 0;
+    return errorFor(db_.get(), code, what);
+}
+
+SqliteError SqliteDatabase::errorFor(sqlite3* db, int code, const std::string& what) {
+    const char* message = db ? sqlite3_errmsg(db) : sqlite3_errstr(code);
+    const int systemErrno = db ? sqlite3_system_errno(db) : 0;
     return SqliteError(code, systemErrno, what + ": " + (message ? message : sqlite3_errstr(code)));
 }
 
@@ -54,7 +58,7 @@ SqliteStatement SqliteDatabase::prepare(const std::string& sql) {
         sqlite3_finalize(statement);
         throw errorFor(code, "prepare");
     }
-    return SqliteStatement(*this, statement);
+    return SqliteStatement(statement);
 }
 
 long long SqliteDatabase::queryInteger(const std::string& sql) {

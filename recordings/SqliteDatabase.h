@@ -33,6 +33,8 @@ class SqliteDatabase {
     [[nodiscard]] sqlite3* handle() const { return db_.get(); }
     // A SqliteError for result code, with the connection's message and errno.
     [[nodiscard]] SqliteError errorFor(int code, const std::string& what) const;
+    // The same for any connection (db may be null: the code's own text then).
+    [[nodiscard]] static SqliteError errorFor(sqlite3* db, int code, const std::string& what);
 
   private:
     struct Close {

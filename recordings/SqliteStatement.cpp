@@ -10,38 +10,38 @@ void SqliteStatement::Finalize::operator()(sqlite3_stmt* statement) const {
     sqlite3_finalize(statement);
 }
 
-SqliteStatement::SqliteStatement(const SqliteDatabase& database, sqlite3_stmt* statement)
-    : database_(&database), statement_(statement) {}
+SqliteStatement::SqliteStatement(sqlite3_stmt* statement) : statement_(statement) {}
 
 namespace {
 
-void check(const SqliteDatabase& database, int code) {
-    if (code != SQLITE_OK) throw database.errorFor(code, "bind");
+void check(sqlite3_stmt* statement, int code) {
+    if (code != SQLITE_OK)
+        throw SqliteDatabase::errorFor(sqlite3_db_handle(statement), code, "bind");
 }
 
 }  // namespace
 
 void SqliteStatement::bindNull(int index) {
-    check(*database_, sqlite3_bind_null(statement_.get(), index));
+    check(statement_.get(), sqlite3_bind_null(statement_.get(), index));
 }
 
 void SqliteStatement::bind(int index, std::int64_t value) {
-    check(*database_, sqlite3_bind_int64(statement_.get(), index, value));
+    check(statement_.get(), sqlite3_bind_int64(statement_.get(), index, value));
 }
 
 void SqliteStatement::bind(int index, double value) {
-    check(*database_, sqlite3_bind_double(statement_.get(), index, value));
+    check(statement_.get(), sqlite3_bind_double(statement_.get(), index, value));
 }
 
 void SqliteStatement::bind(int index, std::string_view text) {
-    check(*database_, sqlite3_bind_text64(statement_.get(), index, text.data(), text.size(),
-                                          SQLITE_STATIC, SQLITE_UTF8));
+    check(statement_.get(), sqlite3_bind_text64(statement_.get(), index, text.data(), text.size(),
+                                                SQLITE_STATIC, SQLITE_UTF8));
 }
 
 void SqliteStatement::bindBlob(int index, std::span<const std::uint8_t> bytes) {
     // An empty blob is still a blob, not NULL: SQLite needs a non-null pointer for that.
     static const std::uint8_t kNothing = 0;
-    check(*database_,
+    check(statement_.get(),
           sqlite3_bind_blob64(statement_.get(), index, bytes.empty() ? &kNothing : bytes.data(),
                               bytes.size(), SQLITE_STATIC));
 }
@@ -50,7 +50,7 @@ bool SqliteStatement::step() {
     const int code = sqlite3_step(statement_.get());
     if (code == SQLITE_ROW) return true;
     if (code == SQLITE_DONE) return false;
-    throw database_->errorFor(code, "step");
+    throw SqliteDatabase::errorFor(sqlite3_db_handle(statement_.get()), code, "step");
 }
 
 void SqliteStatement::reset() {

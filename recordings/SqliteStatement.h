@@ -14,11 +14,10 @@ struct sqlite3_stmt;
 
 namespace pyx::recordings {
 
-class SqliteDatabase;
-
 class SqliteStatement {
   public:
-    SqliteStatement(const SqliteDatabase& database, sqlite3_stmt* statement);
+    // Takes statement over; errors name its connection's message.
+    explicit SqliteStatement(sqlite3_stmt* statement);
 
     // Parameters count from 1, as in SQLite. Texts and blobs are not copied: they must stay
     // as they are until the statement has run (step) or is bound anew.
@@ -44,7 +43,6 @@ class SqliteStatement {
     struct Finalize {
         void operator()(sqlite3_stmt* statement) const;
     };
-    const SqliteDatabase* database_;
     std::unique_ptr<sqlite3_stmt, Finalize> statement_;
 };
 

@@ -45,10 +45,11 @@ struct SourceOptions {
     double speed = 1.0;      // sim: time runs this much faster; replay: 0 = as fast as taken
     bool loop = false;       // replay: start again at the end
     // replay: events handed out and not yet taken in by the store, so that a fast replay
-    // waits for it; none: the shared main queue's pending tasks.
+    // waits for it; none: what waits on the client's serial queue and the main queue.
     std::function<std::size_t()> backlog;
-    // replay: called once, on the replay's thread, when a recording without loop has ended.
-    std::function<void()> onEnd;
+    // replay: called once, on the replay's thread, when the replay is over: a recording
+    // without loop has ended, the recording holds no events, or it is damaged (damaged: true).
+    std::function<void(bool damaged)> onEnd;
 };
 
 // The transport of a source. Throws SourceError for options that do not fit the source

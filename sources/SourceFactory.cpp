@@ -4,6 +4,7 @@
 #include <climits>
 #include <string>
 
+#include "baseband/VelkWrapper.h"
 #include "core/MainQueue.h"
 #include "recordings/RecordingError.h"
 #include "recordings/RecordingTransport.h"
@@ -71,8 +72,10 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
                 replayOptions.speed = options.speed;
                 replayOptions.loop = options.loop;
                 replayOptions.onEnd = options.onEnd;
+                // What the client's serial queue and the main queue still hold: the events
+                // handed out that the store has not taken in yet.
                 replayOptions.backlog = options.backlog ? options.backlog : [] {
-                    return MainQueue::shared().pending();
+                    return MainQueue::shared().pending() + VelkWrapper::queue().pending();
                 };
                 return std::make_shared<replay::ReplayTransport>(std::move(replayOptions));
             } catch (const recordings::RecordingError& e) {
@@ -123,7 +126,7 @@ std::string_view recordingHelp() {
     return "Recording (--record FILE, --append):\n"
            "  every event that reaches the client goes, raw and in order, to FILE (an SQLite\n"
            "  database, .pyxrec), written by a thread of its own and committed at least every\n"
-           "  second. An existing FILE is refused unless --append adds a new session to it.\n"
+           "  500 ms. An existing FILE is refused unless --append adds a new session to it.\n"
            "  When writing fails (disk full, read-only folder, file removed) one line says so\n"
            "  and the recording stops; everything else goes on. Should the writer fall 65,536\n"
            "  events behind, later events are dropped and counted until it catches up (said\n"

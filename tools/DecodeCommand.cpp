@@ -7,6 +7,7 @@
 #include "core/Log.h"
 #include "core/ValueJson.h"
 #include "metrics/MetricCatalogue.h"
+#include "tools/MetricIDText.h"
 #include "tools/RecordReader.h"
 
 namespace pyx {
@@ -16,10 +17,7 @@ namespace {
 using Json = nlohmann::ordered_json;
 
 Json metricText(const std::optional<std::int64_t>& metricID) {
-    if (!metricID) return nullptr;
-    char text[32];
-    std::snprintf(text, sizeof text, "0x%llX", static_cast<unsigned long long>(*metricID));
-    return text;
+    return metricID ? Json(metricIDText(*metricID)) : Json(nullptr);
 }
 
 std::string dumped(const Json& json) {

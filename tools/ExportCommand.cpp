@@ -6,18 +6,20 @@
 #include <iostream>
 #include <memory>
 #include <unordered_map>
+#include <utility>
 
 #include "baseband/EventRecord.h"
 #include "baseband/velk/Names.h"
 #include "core/Format.h"
 #include "core/Log.h"
-#include "core/ValueJson.h"
 #include "metrics/MetricValidator.h"
 #include "recordings/RecordingError.h"
 #include "recordings/RecordingReader.h"
 #include "tools/CsvText.h"
 #include "tools/DecodeCommand.h"
 #include "tools/IsoTime.h"
+#include "tools/MetricIDText.h"
+#include "tools/RecordWriter.h"
 
 namespace pyx {
 namespace {
@@ -27,76 +29,6 @@ using recordings::RecordingError;
 using recordings::RecordingReader;
 
 constexpr std::size_t kChunk = 1 << 16;
-
-bool isPlainKey(std::string_view key) {
-    for (const char c : key) {
-        const bool plain = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') ||
-                           (c >= '0' && c <= '9') || c == '_' || c == '.' || c == '-';
-        if (!plain) return false;
-    }
-    return true;
-}
-
-void appendJsonText(std::string& out, const Value& value) {
-    out += toJson(value).dump(-1, ' ', false, nlohmann::json::error_handler_t::replace);
-}
-
-void appendKey(std::string& out, std::string_view key) {
-    if (isPlainKey(key)) {
-        out += '"';
-        out += key;
-        out += '"';
-    } else {
-        appendJsonText(out, Value(key));
-    }
-}
-
-void appendInteger(std::string& out, auto value) {
-    char digits[24];
-    const auto [end, error] = std::to_chars(digits, digits + sizeof digits, value);
-    static_cast<void>(error);
-    out.append(digits, end);
-}
-
-void appendValue(std::string& out, const Value& value) {
-    static constexpr char kHex[] = "0123456789abcdef";
-    switch (value.kind()) {
-        case Value::Kind::Int:
-            appendInteger(out, value.asInt());
-            return;
-        case Value::Kind::UInt:
-            appendInteger(out, value.asUInt());
-            return;
-        case Value::Kind::Data: {
-            const Bytes& bytes = value.asBytes();
-            const std::size_t at = out.size();
-            out.resize(at + 2 + bytes.size() * 2);
-            char* p = out.data() + at;
-            *p++ = '"';
-            for (const std::uint8_t b : bytes) {
-                *p++ = kHex[b >> 4];
-                *p++ = kHex[b & 15];
-            }
-            *p = '"';
-            return;
-        }
-        default:
-            appendJsonText(out, value);
-            return;
-    }
-}
-
-void appendEntry(std::string& out, std::string_view key, const Value& value) {
-    out += ", ";
-    appendKey(out, key);
-    out += ": ";
-    appendValue(out, value);
-}
-
-std::string metricText(std::optional<std::int64_t> metricID) {
-    return metricID ? format("0x%llX", static_cast<unsigned long long>(*metricID))
-                    : std::string("(no metric ID)");
-}
 
 std::optional<std::int64_t> metricIDFromHex(std::string_view text) {
     if (text.starts_with("0x") || text.starts_with("0X")) text.remove_prefix(2);
@@ -118,17 +50,25 @@ class QuietStore {
     QuietStore& operator=(const QuietStore&) = delete;
 };
 
+using Scalar = std::function<void(const std::string&, const Value&)>;
+
+void flatten(const Value& value, std::string& path, const Scalar& scalar);
+
 // One text per scalar field of a dictionary, named by its path.
-void flatten(const Value& value, std::string& path,
-             const std::function<void(const std::string&, const Value&)>& scalar) {
+void flatten(const Dict& dict, std::string& path, const Scalar& scalar) {
+    const std::size_t mark = path.size();
+    for (const auto& entry : dict) {
+        if (mark > 0) path += '.';
+        path += entry.key;
+        flatten(entry.value, path, scalar);
+        path.resize(mark);
+    }
+}
+
+void flatten(const Value& value, std::string& path, const Scalar& scalar) {
     const std::size_t mark = path.size();
     if (value.isDict()) {
-        for (const auto& entry : value.asDict()) {
-            if (mark > 0) path += '.';
-            path += entry.key;
-            flatten(entry.value, path, scalar);
-            path.resize(mark);
-        }
+        flatten(value.asDict(), path, scalar);
     } else if (value.isArray()) {
         const Array& items = value.asArray();
         for (std::size_t i = 0; i < items.size(); ++i) {
@@ -163,8 +103,9 @@ std::string cellText(const Value& value) {
     }
 }
 
-MetricRecord recordOf(const RecordedEvent& event) {
-    return metricRecordFromEvent(event.object);
+// The event's record; its object is taken, not copied.
+MetricRecord recordOf(RecordedEvent& event) {
+    return metricRecordFromEvent(std::move(event.object));
 }
 
 void damagedLine(std::ostream& err, const RecordingError& e, std::uint64_t exported) {
@@ -213,11 +154,9 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
                 const DecodeOutcome outcome = decodeRecord(*store, recordOf(event));
                 if (outcome.dictionary == nullptr) return true;
                 path.clear();
-                flatten(Value(*outcome.dictionary), path,
-                        [&](const std::string& name, const Value&) {
-                            if (columnIndex.emplace(name, columns.size()).second)
-                                columns.push_back(name);
-                        });
+                flatten(*outcome.dictionary, path, [&](const std::string& name, const Value&) {
+                    if (columnIndex.emplace(name, columns.size()).second) columns.push_back(name);
+                });
                 return true;
             });
         } catch (const RecordingError&) {
@@ -240,17 +179,17 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
             if (outcome.error) {
                 ++refused;
                 err << "pyxonctl export: event " << event.id
-                    << " skipped: " << metricText(outcome.metricID) << ": " << *outcome.error
+                    << " skipped: " << metricIDText(outcome.metricID) << ": " << *outcome.error
                     << '\n';
                 return true;
             }
             if (outcome.dictionary == nullptr) return true;
             for (auto& cell : cells) cell.clear();
             cells[0] = isoTime(event.wallNs);
-            cells[1] = metricText(outcome.metricID);
+            cells[1] = metricIDText(outcome.metricID);
             cells[2] = outcome.property;
             path.clear();
-            flatten(Value(*outcome.dictionary), path, [&](const std::string& name, const Value& v) {
+            flatten(*outcome.dictionary, path, [&](const std::string& name, const Value& v) {
                 const auto at = columnIndex.find(name);
                 if (at != columnIndex.end()) cells[at->second] = cellText(v);
             });
@@ -279,19 +218,10 @@ void appendExportLine(std::string& out, const RecordedEvent& event) {
     out += R"({"time": ")";
     appendIsoTime(out, event.wallNs);
     out += '"';
-    if (!event.object.isDict()) {
-        out += '}';
-        return;
-    }
-    // As pyxonctl listen prints a record: the metric ID, the payload, then the other keys.
-    const Dict& record = event.object.asDict();
-    const Value* metricID = record.find(velk::kKeyMetricID);
-    const Value* payload = record.find(velk::kKeyPayload);
-    if (metricID) appendEntry(out, velk::kKeyMetricID, *metricID);
-    if (payload) appendEntry(out, velk::kKeyPayload, *payload);
-    for (const auto& entry : record) {
-        if (&entry.value != metricID && &entry.value != payload)
-            appendEntry(out, entry.key, entry.value);
+    // Then the record as pyxonctl listen prints it.
+    if (event.object.isDict() && !event.object.asDict().empty()) {
+        out += ", ";
+        appendRecordFields(out, event.object.asDict());
     }
     out += '}';
 }
@@ -311,11 +241,15 @@ int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err
     const auto time = [&](const std::optional<std::string>& text, const char* option,
                           std::optional<std::int64_t>& into) {
         if (!text) return true;
-        into = parseIsoTime(*text);
-        if (!into)
-            err << "pyxonctl export: " << option << " '" << *text
-                << "' is not a time; example: 2026-11-23T19:05:50Z (UTC without a zone)\n";
-        return into.has_value();
+        IsoTimeRefusal refusal = IsoTimeRefusal::NotATime;
+        into = parseIsoTime(*text, &refusal);
+        if (into) return true;
+        err << "pyxonctl export: " << option << " '" << *text;
+        if (refusal == IsoTimeRefusal::OutOfRange)
+            err << "' is outside the times a recording can hold, " << isoTimeRange() << '\n';
+        else
+            err << "' is not a time; example: 2026-11-23T19:05:50Z (UTC without a zone)\n";
+        return false;
     };
     if (!time(request.from, "--from", filter.fromNs) || !time(request.to, "--to", filter.toNs))
         return 2;
@@ -330,8 +264,14 @@ int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err
         err << "pyxonctl export: " << e.what() << '\n';
         return 1;
     }
-    return request.format == "csv" ? exportCsv(*reader, filter, out, err)
-                                   : exportJsonl(*reader, filter, out, err);
+    const int status = request.format == "csv" ? exportCsv(*reader, filter, out, err)
+                                               : exportJsonl(*reader, filter, out, err);
+    // A full disk or a closed pipe: what was asked for did not all get out.
+    if (!out) {
+        err << "pyxonctl export: writing the output failed\n";
+        return 1;
+    }
+    return status;
 }
 
 Subcommand addExportCommand(CLI::App& pyxonctl) {

@@ -35,7 +35,8 @@ void appendExportLine(std::string& out, const recordings::RecordedEvent& event);
 
 // Writes the export to out and what went wrong to err (one line each). Returns 0; 1 when the
 // file cannot be read (nothing written) or breaks off (what was read before is written, and a
-// line says how many events that was); 2 for a request that does not make sense.
+// line says how many events that was) or when out cannot be written; 2 for a request that does
+// not make sense.
 int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err);
 
 Subcommand addExportCommand(CLI::App& pyxonctl);

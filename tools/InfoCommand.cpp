@@ -5,10 +5,10 @@
 #include <memory>
 #include <nlohmann/json.hpp>
 
-#include "core/Format.h"
 #include "recordings/RecordingError.h"
 #include "recordings/RecordingReader.h"
 #include "tools/IsoTime.h"
+#include "tools/MetricIDText.h"
 
 namespace pyx {
 namespace {
@@ -30,8 +30,7 @@ int runInfo(const std::string& file, std::ostream& out, std::ostream& err) {
         return 1;
     }
     Json kinds = Json::object();
-    for (const auto& [metricID, count] : summary.kinds)
-        kinds[format("0x%llX", static_cast<unsigned long long>(metricID))] = count;
+    for (const auto& [metricID, count] : summary.kinds) kinds[metricIDText(metricID)] = count;
     Json sessions = Json::array();
     for (const auto& session : summary.sessions) {
         sessions.push_back(Json{

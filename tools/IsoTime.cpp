@@ -1,34 +1,13 @@
 #include "tools/IsoTime.h"
 
 #include <array>
-#include <charconv>
+#include <chrono>
+#include <limits>
 
 namespace pyx {
 namespace {
 
 constexpr std::int64_t kNsPerSecond = 1'000'000'000;
-
-// Days since 1970-01-01 of a civil date, and back (proleptic Gregorian calendar).
-std::int64_t daysFromCivil(std::int64_t y, unsigned m, unsigned d) {
-    y -= m <= 2;
-    const std::int64_t era = (y >= 0 ? y : y - 399) / 400;
-    const auto yoe = static_cast<unsigned>(y - era * 400);
-    const unsigned doy = (153 * (m > 2 ? m - 3 : m + 9) + 2) / 5 + d - 1;
-    const unsigned doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
-    return era * 146097 + static_cast<std::int64_t>(doe) - 719468;
-}
-
-void civilFromDays(std::int64_t z, std::int64_t& y, unsigned& m, unsigned& d) {
-    z += 719468;
-    const std::int64_t era = (z >= 0 ? z : z - 146096) / 146097;
-    const auto doe = static_cast<unsigned>(z - era * 146097);
-    const unsigned yoe = (doe - doe / 1460 + doe / 36524 - doe / 146096) / 365;
-    const unsigned doy = doe - (365 * yoe + yoe / 4 - yoe / 100);
-    const unsigned mp = (5 * doy + 2) / 153;
-    d = doy - (153 * mp + 2) / 5 + 1;
-    m = mp < 10 ? mp + 3 : mp - 9;
-    y = static_cast<std::int64_t>(yoe) + era * 400 + (m <= 2);
-}
 
 void appendDigits(std::string& out, std::uint64_t value, int width) {
     std::array<char, 20> digits{};
@@ -82,15 +61,13 @@ void appendIsoTime(std::string& out, std::int64_t ns) {
         inDay += 86400;
         --days;
     }
-    std::int64_t year = 0;
-    unsigned month = 0;
-    unsigned day = 0;
-    civilFromDays(days, year, month, day);
-    appendDigits(out, static_cast<std::uint64_t>(year), 4);
+    const std::chrono::year_month_day date{
+        std::chrono::sys_days{std::chrono::days{static_cast<std::chrono::days::rep>(days)}}};
+    appendDigits(out, static_cast<std::uint64_t>(static_cast<int>(date.year())), 4);
     out += '-';
-    appendDigits(out, month, 2);
+    appendDigits(out, static_cast<unsigned>(date.month()), 2);
     out += '-';
-    appendDigits(out, day, 2);
+    appendDigits(out, static_cast<unsigned>(date.day()), 2);
     out += 'T';
     appendDigits(out, static_cast<std::uint64_t>(inDay / 3600), 2);
     out += ':';
@@ -108,47 +85,71 @@ std::string isoTime(std::int64_t ns) {
     return text;
 }
 
-std::optional<std::int64_t> parseIsoTime(std::string_view text) {
+std::optional<std::int64_t> parseIsoTime(std::string_view text, IsoTimeRefusal* refusal) {
+    const auto refuse = [refusal](IsoTimeRefusal why) -> std::optional<std::int64_t> {
+        if (refusal) *refusal = why;
+        return std::nullopt;
+    };
     Scanner in(text);
     std::int64_t year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0, fraction = 0;
     if (!in.number(4, year) || !in.take('-') || !in.number(2, month) || !in.take('-') ||
         !in.number(2, day))
-        return std::nullopt;
-    if (month < 1 || month > 12 || day < 1 || day > 31) return std::nullopt;
+        return refuse(IsoTimeRefusal::NotATime);
+    const std::chrono::year_month_day date{std::chrono::year{static_cast<int>(year)},
+                                           std::chrono::month{static_cast<unsigned>(month)},
+                                           std::chrono::day{static_cast<unsigned>(day)}};
+    if (!date.ok()) return refuse(IsoTimeRefusal::NotATime);
     if (in.take('T') || in.take(' ')) {
-        if (!in.number(2, hour) || !in.take(':') || !in.number(2, minute)) return std::nullopt;
+        if (!in.number(2, hour) || !in.take(':') || !in.number(2, minute))
+            return refuse(IsoTimeRefusal::NotATime);
         if (in.take(':')) {
-            if (!in.number(2, second)) return std::nullopt;
+            if (!in.number(2, second)) return refuse(IsoTimeRefusal::NotATime);
             if (in.take('.') || in.take(',')) {
                 int digits = 0;
                 while (in.peek() >= '0' && in.peek() <= '9') {
                     std::int64_t digit = 0;
                     in.number(1, digit);
-                    if (++digits > 9) return std::nullopt;
+                    if (++digits > 9) return refuse(IsoTimeRefusal::NotATime);
                     fraction = fraction * 10 + digit;
                 }
-                if (digits == 0) return std::nullopt;
+                if (digits == 0) return refuse(IsoTimeRefusal::NotATime);
                 for (; digits < 9; ++digits) fraction *= 10;
             }
         }
-        if (hour > 23 || minute > 59 || second > 60) return std::nullopt;
+        if (hour > 23 || minute > 59 || second > 60) return refuse(IsoTimeRefusal::NotATime);
     }
     std::int64_t offset = 0;
     if (!in.take('Z')) {
         const bool plus = in.take('+');
         if (plus || in.take('-')) {
             std::int64_t hours = 0, minutes = 0;
-            if (!in.number(2, hours)) return std::nullopt;
+            if (!in.number(2, hours)) return refuse(IsoTimeRefusal::NotATime);
             in.take(':');
-            if (!in.atEnd() && !in.number(2, minutes)) return std::nullopt;
+            if (!in.atEnd() && !in.number(2, minutes)) return refuse(IsoTimeRefusal::NotATime);
+            if (hours > 23 || minutes > 59) return refuse(IsoTimeRefusal::NotATime);
             offset = (hours * 3600 + minutes * 60) * (plus ? 1 : -1);
         }
     }
-    if (!in.atEnd()) return std::nullopt;
-    const std::int64_t days =
-        daysFromCivil(year, static_cast<unsigned>(month), static_cast<unsigned>(day));
-    const std::int64_t seconds = days * 86400 + hour * 3600 + minute * 60 + second - offset;
-    return seconds * kNsPerSecond + fraction;
+    if (!in.atEnd()) return refuse(IsoTimeRefusal::NotATime);
+    // A four-digit year keeps this far from overflowing; the nanoseconds may not fit.
+    const std::int64_t days = std::chrono::sys_days{date}.time_since_epoch().count();
+    std::int64_t seconds = days * 86400 + hour * 3600 + minute * 60 + second - offset;
+    // Before 1970 the fraction is taken from the next second up, so that the first times that
+    // fit are not lost to an intermediate product that does not.
+    if (seconds < 0 && fraction > 0) {
+        ++seconds;
+        fraction -= kNsPerSecond;
+    }
+    std::int64_t ns = 0;
+    if (__builtin_mul_overflow(seconds, kNsPerSecond, &ns) ||
+        __builtin_add_overflow(ns, fraction, &ns))
+        return refuse(IsoTimeRefusal::OutOfRange);
+    return ns;
+}
+
+std::string isoTimeRange() {
+    return isoTime(std::numeric_limits<std::int64_t>::min()) + " to " +
+           isoTime(std::numeric_limits<std::int64_t>::max());
 }
 
 }  // namespace pyx

@@ -13,9 +13,19 @@ namespace pyx {
 void appendIsoTime(std::string& out, std::int64_t ns);
 [[nodiscard]] std::string isoTime(std::int64_t ns);
 
+// Why a text was not read as a time.
+enum class IsoTimeRefusal {
+    NotATime,    // not of the forms below, or no such date (2026-02-31), hour or zone
+    OutOfRange,  // a time, but outside what ns since 1970 in 64 bits can hold (isoTimeRange)
+};
+
 // "YYYY-MM-DD", "YYYY-MM-DDTHH:MM", "YYYY-MM-DDTHH:MM:SS" with an optional fraction of up to
 // nine digits, a blank instead of the T, and "Z", "+HH:MM" or "-HH:MM" at the end (no zone:
-// UTC). Nothing for anything else.
-[[nodiscard]] std::optional<std::int64_t> parseIsoTime(std::string_view text);
+// UTC). Nothing for anything else, with the reason in refusal when one is given.
+[[nodiscard]] std::optional<std::int64_t> parseIsoTime(std::string_view text,
+                                                       IsoTimeRefusal* refusal = nullptr);
+
+// The first and the last time a recording can hold, "... to ...".
+[[nodiscard]] std::string isoTimeRange();
 
 }  // namespace pyx

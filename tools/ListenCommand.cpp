@@ -1,5 +1,6 @@
 #include "tools/ListenCommand.h"
 
+#include <atomic>
 #include <csignal>
 #include <cstdio>
 #include <iostream>
@@ -82,8 +83,9 @@ int runListen(const ListenOptions& options) {
     mainQueue.claimCurrentThread();
     const StopOnSignal stopOnSignal(mainQueue);
 
-    std::shared_ptr<velk::client::Transport> transport;
-    std::shared_ptr<recordings::RecordingWriter> recording;
+    // Set on the replay's thread, read once the main queue has stopped.
+    std::atomic<bool> damaged{false};
+    std::optional<ProgramSource> source;
     try {
         sources::SourceOptions sourceOptions;
         sourceOptions.choice = *choice;
@@ -92,19 +94,17 @@ int runListen(const ListenOptions& options) {
         sourceOptions.loop = options.loop;
         // A replay that ends ends the run, once the events before the end are printed: the
         // stop goes the way the events go, through the serial queue, then the main queue.
-        sourceOptions.onEnd = [&mainQueue] {
+        sourceOptions.onEnd = [&mainQueue, &damaged](bool isDamaged) {
+            if (isDamaged) damaged = true;
             VelkWrapper::queue().post(
                 [&mainQueue] { mainQueue.post([&mainQueue] { mainQueue.stop(); }); });
         };
-        auto source = openProgramSource(std::move(sourceOptions), options.record, options.append,
-                                        PYXON_VERSION);
-        transport = std::move(source.transport);
-        recording = std::move(source.recording);
+        source.emplace(openProgramSource(std::move(sourceOptions), options.record, options.append,
+                                         PYXON_VERSION));
     } catch (const sources::SourceError& e) {
         std::cerr << "pyxonctl listen: " << e.what() << "\n";
         return 2;
     }
-    velk::client::SetTransportFactory([transport] { return transport; });
 
     const auto printer = std::make_shared<EventPrinter>(mainQueue, options.count);
     const auto client = VelkWrapper::create(mainQueue);
@@ -125,11 +125,8 @@ int runListen(const ListenOptions& options) {
     }
     mainQueue.run();
     client->setDelegate({});
-    // The source's thread stops here, before exit destroys the queues it posts events to.
-    transport->stopEvents();
-    // What is still queued for the recording is written before the process ends.
-    if (recording) recording->close();
-    return 0;
+    source->close();
+    return damaged ? 1 : 0;
 }
 
 }  // namespace
@@ -171,7 +168,8 @@ Subcommand addListenCommand(CLI::App& pyxonctl) {
     listen->footer(
         std::string(sources::sourceHelp()) + "\n" + std::string(sources::recordingHelp()) +
         "\nWithout --duration or --count it runs until SIGINT or SIGTERM, or until a replay\n"
-        "without --loop reaches the end of its recording; it exits 0.\n"
+        "without --loop reaches the end of its recording; it exits 0, or 1 when the recording\n"
+        "turns out damaged (what was read before the damage is printed).\n"
         "Examples:\n"
         "  pyxonctl listen --speed 20 --count 100 > drive.jsonl\n"
         "  pyxonctl listen --source modem --duration 10 | pyxonctl screen LTE \"Serving "

@@ -13,4 +13,8 @@ namespace pyx {
 // The line, without its newline.
 [[nodiscard]] std::string recordLine(const MetricRecord& record);
 
+// The line's fields without the braces ("\"kKeyMetricID\": 3986178, ..."), appended to out;
+// for lines that put fields of their own first.
+void appendRecordFields(std::string& out, const MetricRecord& record);
+
 }  // namespace pyx

@@ -9,6 +9,7 @@
 #include "core/Format.h"
 #include "core/Log.h"
 #include "metrics/MetricValidator.h"
+#include "tools/MetricIDText.h"
 #include "tools/RecordReader.h"
 #include "ui/SecondLevelViewController.h"
 #include "ui/ThirdLevelViewController.h"
@@ -22,11 +23,6 @@ Json textOrNull(const std::optional<std::string>& text) {
     return text ? Json(*text) : Json(nullptr);
 }
 
-std::string metricText(const std::optional<std::int64_t>& metricID) {
-    return metricID ? format("0x%llX", static_cast<unsigned long long>(*metricID))
-                    : std::string("(no metric ID)");
-}
-
 // Feeds one line to the intake as the baseband client would; answers why it was refused, if
 // it was.
 std::optional<std::string> feed(MetricValidator& store, const std::string& line) {
@@ -34,9 +30,9 @@ std::optional<std::string> feed(MetricValidator& store, const std::string& line)
         store.metricsDidUpdate(readRecord(line));
         return std::nullopt;
     } catch (const RecordError& error) {
-        return metricText(error.metricID()) + ": " + error.reason();
+        return metricIDText(error.metricID()) + ": " + error.reason();
     } catch (const MetricRejected& rejection) {
-        return metricText(rejection.metricID()) + ": " + rejection.reason();
+        return metricIDText(rejection.metricID()) + ": " + rejection.reason();
     }
 }
 

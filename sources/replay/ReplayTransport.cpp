@@ -67,11 +67,6 @@ void ReplayTransport::stopThread() {
     thread_.join();
 }
 
-std::uint64_t ReplayTransport::played() const {
-    const std::lock_guard lock(mutex_);
-    return played_;
-}
-
 bool ReplayTransport::finished() const {
     const std::lock_guard lock(mutex_);
     return finished_;
@@ -79,9 +74,12 @@ bool ReplayTransport::finished() const {
 
 bool ReplayTransport::waitForRoom(const std::stop_token& stop) {
     if (!options_.backlog) return !stop.stop_requested();
+    // The steady state of a replay as fast as it is taken. A full backlog takes the store
+    // longer than 2 ms to work through, so polling that often keeps it from running dry
+    // without spinning.
     while (options_.backlog() > options_.maxBacklog) {
         std::unique_lock lock(waitMutex_);
-        if (wake_.wait_for(lock, stop, std::chrono::microseconds(200), [] { return false; }) ||
+        if (wake_.wait_for(lock, stop, std::chrono::milliseconds(2), [] { return false; }) ||
             stop.stop_requested())
             return false;
     }
@@ -136,8 +134,14 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
             });
         } catch (const recordings::RecordingError& e) {
             systemLog(format("replay %s; the replay stops here", e.what()));
-            const std::lock_guard lock(mutex_);
-            finished_ = true;
+            bool say = false;
+            {
+                const std::lock_guard lock(mutex_);
+                finished_ = true;
+                say = !endSaid_;
+                endSaid_ = true;
+            }
+            if (say && options_.onEnd) options_.onEnd(true);
             return;
         }
         if (stopped) return;
@@ -173,7 +177,7 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
             if (options_.loop)
                 systemLog(
                     format("replay %s: the recording holds no events", options_.file.c_str()));
-            if (say && options_.onEnd) options_.onEnd();
+            if (say && options_.onEnd) options_.onEnd(false);
             return;
         }
     }

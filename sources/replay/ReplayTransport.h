@@ -34,8 +34,10 @@ class ReplayTransport : public velk::client::Transport {
         // Events handed out and not yet taken by the store; none: no limit.
         std::function<std::size_t()> backlog;
         std::size_t maxBacklog = 1024;
-        // Called once, on the replay's thread, after the last event without loop.
-        std::function<void()> onEnd;
+        // Called once, on the replay's thread, when the replay is over: after the last event
+        // without loop, at once for a recording that holds no events (loop or not), or where a
+        // damaged recording breaks off (damaged: true).
+        std::function<void(bool damaged)> onEnd;
     };
 
     // Opens and checks the file; throws recordings::RecordingError (one line naming the file)
@@ -50,8 +52,6 @@ class ReplayTransport : public velk::client::Transport {
     void startEvents(EventSink sink) override;
     void stopEvents() override;
 
-    // Events handed to the sink so far (all passes).
-    [[nodiscard]] std::uint64_t played() const;
     // Whether the replay reached the end of the recording (without loop: it is over).
     [[nodiscard]] bool finished() const;
 

@@ -14,8 +14,8 @@
 #include <utility>
 #include <vector>
 
-#include "ProgramRun.h"
 #include "tests/support/ChildProcess.h"
+#include "tests/support/ProgramRun.h"
 
 namespace {
 

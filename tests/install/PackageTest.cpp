@@ -7,7 +7,7 @@
 #include <set>
 #include <string>
 
-#include "ProgramRun.h"
+#include "tests/support/ProgramRun.h"
 
 namespace {
 

@@ -15,19 +15,11 @@ namespace {
 using pyx::recordings::RecordingError;
 using pyx::recordings::RecordingReader;
 using pyx::recordings::RecordingWriter;
+using pyx::testing::recordingOptions;
 using pyx::testing::TempDir;
 
-RecordingWriter::Options optionsFor(const std::string& file) {
-    RecordingWriter::Options options;
-    options.path = file;
-    options.session.programVersion = "0.1.0";
-    options.session.source = "sim";
-    options.session.host = "testhost";
-    return options;
-}
-
 void write(const std::string& file, int events, std::size_t payloadSize = 12) {
-    RecordingWriter writer(optionsFor(file));
+    RecordingWriter writer(recordingOptions(file));
     for (int n = 0; n < events; ++n)
         writer.add(velk::kEventMetric, pyx::testing::sampleEvent(n, payloadSize));
 }
@@ -138,7 +130,7 @@ TEST(BadRecording, AppendingToAFileThatIsNotARecordingIsRefused) {
     const TempDir dir;
     const std::string file = dir.file("notes.txt");
     std::ofstream(file) << std::string(300, 'n');
-    auto options = optionsFor(file);
+    auto options = recordingOptions(file);
     options.append = true;
     try {
         RecordingWriter writer(options);
@@ -152,7 +144,7 @@ TEST(BadRecording, AppendingToAFileThatIsNotARecordingIsRefused) {
 TEST(BadRecording, RecordingIntoADirectoryIsRefused) {
     const TempDir dir;
     try {
-        RecordingWriter writer(optionsFor(dir.path().string()));
+        RecordingWriter writer(recordingOptions(dir.path().string()));
         FAIL() << "recorded into a directory";
     } catch (const RecordingError& e) {
         EXPECT_EQ(e.kind(), RecordingError::Kind::NotAFile);

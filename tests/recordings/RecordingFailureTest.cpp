@@ -21,18 +21,10 @@ namespace {
 using pyx::recordings::RecordingReader;
 using pyx::recordings::RecordingWriter;
 using pyx::testing::readAll;
+using pyx::testing::recordingOptions;
 using pyx::testing::sampleEvent;
 using pyx::testing::sequenceOf;
 using pyx::testing::TempDir;
-
-RecordingWriter::Options optionsFor(const std::string& file) {
-    RecordingWriter::Options options;
-    options.path = file;
-    options.session.programVersion = "0.1.0";
-    options.session.source = "sim";
-    options.session.host = "testhost";
-    return options;
-}
 
 std::int64_t wallNow() {
     return std::chrono::duration_cast<std::chrono::nanoseconds>(
@@ -61,7 +53,7 @@ TEST(RecordingFailure, AProcessKilledMidBurstLeavesAFileThatOpensWithEveryCommit
     ASSERT_GE(child, 0);
     if (child == 0) {
         // The child records a steady burst (about 100,000 events a second) until it is killed.
-        auto options = optionsFor(file);
+        auto options = recordingOptions(file);
         options.queueCapacity = 1 << 22;
         RecordingWriter writer(options);
         for (std::int64_t n = 0;; ++n) {
@@ -100,20 +92,25 @@ TEST(RecordingFailure, AFileSizeLimitStopsTheRecordingWithOneLineAndTheFileStill
         std::FILE* out = std::fopen(err.c_str(), "w");
         if (out == nullptr) _exit(4);
         dup2(fileno(out), STDERR_FILENO);
-        auto options = optionsFor(file);
+        auto options = recordingOptions(file);
         options.commitInterval = std::chrono::milliseconds(20);
         RecordingWriter writer(options);
         const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(60);
+        std::uint64_t added = 0;
         for (std::int64_t n = 0; !writer.counts().stopped; ++n) {
             if (std::chrono::steady_clock::now() > deadline) _exit(3);
             writer.add(velk::kEventMetric, sampleEvent(n, 200));
+            ++added;
             if (n % 10 == 9) std::this_thread::sleep_for(std::chrono::milliseconds(1));
         }
         // The recording has stopped; the program goes on and closes normally.
         writer.add(velk::kEventMetric, sampleEvent(0));
+        ++added;
         writer.close();
         std::fflush(stderr);
-        _exit(0);
+        // Every event added is either in the file or counted as dropped.
+        const auto counts = writer.counts();
+        _exit(counts.recorded + counts.dropped == added ? 0 : 5);
     }
     int status = 0;
     ASSERT_EQ(waitpid(child, &status, 0), child);
@@ -135,7 +132,7 @@ TEST(RecordingFailure, ARemovedFileStopsTheRecordingWithOneLine) {
     const pyx::CapturedLines log(pyx::systemLogSink());
     const TempDir dir;
     const std::string file = dir.file("vanishing.pyxrec");
-    RecordingWriter writer(optionsFor(file));
+    RecordingWriter writer(recordingOptions(file));
     for (std::int64_t n = 0; n < 10; ++n) writer.add(velk::kEventMetric, sampleEvent(n));
     writer.flush();
     std::filesystem::remove(file);
@@ -146,6 +143,9 @@ TEST(RecordingFailure, ARemovedFileStopsTheRecordingWithOneLine) {
     EXPECT_TRUE(writer.counts().stopped);
     writer.add(velk::kEventMetric, sampleEvent(20));
     writer.close();
+    // The ten committed to the removed file are lost with it, and the one after the stop.
+    EXPECT_EQ(writer.counts().recorded, 10u);
+    EXPECT_EQ(writer.counts().dropped, 11u);
     const auto lines = log.lines();
     ASSERT_EQ(lines.size(), 1u);
     EXPECT_EQ(lines[0], "recording " + file +
@@ -168,7 +168,7 @@ TEST(RecordingFailure, AFolderThatCannotBeWrittenStopsTheRecordingWithOneLine) {
         if (geteuid() == 0 && (setgid(65534) != 0 || setuid(65534) != 0)) _exit(4);
         dup2(pipeEnds[1], STDERR_FILENO);
         close(pipeEnds[0]);
-        RecordingWriter writer(optionsFor(file));
+        RecordingWriter writer(recordingOptions(file));
         writer.add(velk::kEventMetric, sampleEvent(0));
         writer.flush();
         const bool stopped = writer.counts().stopped;

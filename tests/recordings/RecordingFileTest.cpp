@@ -26,15 +26,11 @@ using pyx::testing::readAll;
 using pyx::testing::sampleEvent;
 using pyx::testing::TempDir;
 
+// Of a session with a seed and a speed, which read back.
 RecordingWriter::Options optionsFor(const std::string& file, bool append = false) {
-    RecordingWriter::Options options;
-    options.path = file;
-    options.append = append;
-    options.session.programVersion = "0.1.0";
-    options.session.source = "sim";
+    auto options = pyx::testing::recordingOptions(file, append);
     options.session.seed = 7;
     options.session.speed = 20.0;
-    options.session.host = "testhost";
     return options;
 }
 

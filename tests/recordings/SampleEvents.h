@@ -9,6 +9,7 @@
 #include "baseband/velk/Names.h"
 #include "core/Value.h"
 #include "recordings/RecordingReader.h"
+#include "recordings/RecordingWriter.h"
 
 namespace pyx::testing {
 
@@ -17,6 +18,18 @@ struct StreamEvent {
     Value object;
     friend bool operator==(const StreamEvent&, const StreamEvent&) = default;
 };
+
+// A writer's options for a test recording at file: a session of the simulated source.
+inline recordings::RecordingWriter::Options recordingOptions(const std::string& file,
+                                                             bool append = false) {
+    recordings::RecordingWriter::Options options;
+    options.path = file;
+    options.append = append;
+    options.session.programVersion = "0.1.0";
+    options.session.source = "sim";
+    options.session.host = "testhost";
+    return options;
+}
 
 // Event number n: a metric event whose trigger reference is n (kinds rotate over three IDs).
 inline Value sampleEvent(std::int64_t n, std::size_t payloadSize = 12) {

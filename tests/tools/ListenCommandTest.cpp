@@ -18,30 +18,17 @@
 #include <thread>
 #include <vector>
 
+#include "tests/support/ProgramRun.h"
 #include "tools/RecordReader.h"
 
 namespace {
 
 using Json = nlohmann::ordered_json;
-
-struct ProgramRun {
-    int exitCode = -1;
-    std::string out;
-};
+using pyx::test::ProgramRun;
 
 // Runs a shell command line (pyxonctl is $PYXONCTL in it) and collects its stdout.
 ProgramRun shell(const std::string& commandLine) {
-    const std::string command =
-        std::string("PYXONCTL='") + PYXONCTL_PATH + "'; { " + commandLine + "; } 2>/dev/null";
-    ProgramRun run;
-    std::FILE* pipe = ::popen(command.c_str(), "r");
-    if (pipe == nullptr) return run;
-    char buffer[4096];
-    for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;)
-        run.out.append(buffer, n);
-    const int status = ::pclose(pipe);
-    run.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-    return run;
+    return ProgramRun::shell(std::string("PYXONCTL='") + PYXONCTL_PATH + "'; " + commandLine);
 }
 
 std::vector<std::string> lines(const std::string& text) {

@@ -12,44 +12,16 @@
 #include <string>
 #include <vector>
 
+#include "tests/support/ProgramRun.h"
+
 namespace {
 
 using Json = nlohmann::ordered_json;
-
-struct ProgramRun {
-    int exitCode = -1;
-    std::string out;
-    std::string err;
-};
-
-std::string readFile(const std::string& path) {
-    std::ifstream in(path);
-    return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
-}
+using pyx::test::ProgramRun;
 
 // Runs pyxonctl with arguments, input on its stdin; collects stdout and stderr.
 ProgramRun pyxonctl(const std::string& arguments, const std::string& input) {
-    // Tests may run in parallel processes: each run has files of its own.
-    static int runs = 0;
-    const std::string stem = ::testing::TempDir() + "pyxonctl_" + std::to_string(::getpid()) + "_" +
-                             std::to_string(++runs);
-    const std::string inPath = stem + "_in.jsonl";
-    const std::string errPath = stem + "_err.txt";
-    std::ofstream(inPath) << input;
-    const std::string command = std::string("'") + PYXONCTL_PATH + "' " + arguments + " < '" +
-                                inPath + "' 2> '" + errPath + "'";
-    ProgramRun run;
-    std::FILE* pipe = ::popen(command.c_str(), "r");
-    if (pipe == nullptr) return run;
-    char buffer[4096];
-    for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;)
-        run.out.append(buffer, n);
-    const int status = ::pclose(pipe);
-    run.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-    run.err = readFile(errPath);
-    std::remove(inPath.c_str());
-    std::remove(errPath.c_str());
-    return run;
+    return ProgramRun::shell(std::string("'") + PYXONCTL_PATH + "' " + arguments, input);
 }
 
 std::vector<Json> jsonLines(const std::string& text) {

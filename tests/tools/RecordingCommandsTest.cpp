@@ -8,6 +8,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <limits>
 #include <nlohmann/json.hpp>
 #include <set>
 #include <sstream>
@@ -19,10 +20,12 @@
 #include "sources/sim/SimulatedBaseband.h"
 #include "tests/recordings/SampleEvents.h"
 #include "tests/recordings/TempDir.h"
+#include "tests/support/ProgramRun.h"
 #include "tools/CsvText.h"
 #include "tools/ExportCommand.h"
 #include "tools/InfoCommand.h"
 #include "tools/IsoTime.h"
+#include "tools/MetricIDText.h"
 #include "tools/RecordWriter.h"
 #ifdef PYXON_HAVE_SCREEN_COMMAND
 #include "tools/ScreenCommand.h"
@@ -159,6 +162,21 @@ void writeSamples(const std::string& file, int count) {
         writer.add(n % 4 == 3 ? velk::kEventTrigger : velk::kEventMetric, sampleEvent(n));
 }
 
+TEST(RecordWriter, TheMetricIDAndPayloadComeFirstThenTheOtherKeysInTheirOrder) {
+    pyx::MetricRecord record;
+    record.set("kKeyProfileID", pyx::Value(std::int64_t{0}));
+    record.set("kKeyPayload", pyx::Value(pyx::Bytes{0x0a, 0xff}));
+    record.set("odd \"key\"", pyx::Value(std::string("text")));
+    record.set("kKeyMetricID", pyx::Value(std::int64_t{3952132}));
+    record.set("kKeyRatio", pyx::Value(0.5f));
+    EXPECT_EQ(pyx::recordLine(record),
+              "{\"kKeyMetricID\": 3952132, \"kKeyPayload\": \"0aff\", \"kKeyProfileID\": 0, "
+              "\"odd \\\"key\\\"\": \"text\", \"kKeyRatio\": 0.5}");
+    EXPECT_EQ(pyx::recordLine(pyx::MetricRecord{}), "{}");
+    EXPECT_EQ(pyx::metricIDText(std::int64_t{0x3C4E04}), "0x3C4E04");
+    EXPECT_EQ(pyx::metricIDText(std::optional<std::int64_t>{}), "(no metric ID)");
+}
+
 TEST(IsoTime, TimesAreWrittenInUtcWithNanosecondsAndReadBackInTheFormsGiven) {
     EXPECT_EQ(pyx::isoTime(0), "1970-01-01T00:00:00.000000000Z");
     EXPECT_EQ(pyx::isoTime(1'795'461'678'469'772'393), "2026-11-23T19:21:18.469772393Z");
@@ -170,6 +188,68 @@ TEST(IsoTime, TimesAreWrittenInUtcWithNanosecondsAndReadBackInTheFormsGiven) {
     EXPECT_FALSE(pyx::parseIsoTime("yesterday"));
     EXPECT_FALSE(pyx::parseIsoTime("2026-13-01"));
     EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21:18Zjunk"));
+}
+
+TEST(IsoTime, DatesThatDoNotExistAndZonesOutOfRangeAreNotTimes) {
+    pyx::IsoTimeRefusal refusal = pyx::IsoTimeRefusal::OutOfRange;
+    EXPECT_FALSE(pyx::parseIsoTime("2026-02-31", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::NotATime);
+    EXPECT_FALSE(pyx::parseIsoTime("2026-02-29"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-04-31"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-00-10"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-01-00"));
+    EXPECT_EQ(pyx::parseIsoTime("2024-02-29"), 1'709'164'800'000'000'000);
+    EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21+24:00"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21+02:60"));
+    EXPECT_FALSE(pyx::parseIsoTime("2026-11-23T19:21-99:00"));
+    EXPECT_EQ(pyx::parseIsoTime("2026-11-23T19:21-23:59"),
+              1'795'461'660'000'000'000 + 86'340'000'000'000);
+}
+
+TEST(IsoTime, TimesBeyondWhatNanosecondsSince1970CanHoldAreRefusedAsOutOfRange) {
+    pyx::IsoTimeRefusal refusal = pyx::IsoTimeRefusal::NotATime;
+    EXPECT_FALSE(pyx::parseIsoTime("9999-12-31", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::OutOfRange);
+    refusal = pyx::IsoTimeRefusal::NotATime;
+    EXPECT_FALSE(pyx::parseIsoTime("0001-01-01", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::OutOfRange);
+    // The last and the first nanosecond that fit, and one past each.
+    constexpr auto kMax = std::numeric_limits<std::int64_t>::max();
+    constexpr auto kMin = std::numeric_limits<std::int64_t>::min();
+    EXPECT_EQ(pyx::isoTime(kMax), "2262-04-11T23:47:16.854775807Z");
+    EXPECT_EQ(pyx::isoTime(kMin), "1677-09-21T00:12:43.145224192Z");
+    EXPECT_EQ(pyx::parseIsoTime("2262-04-11T23:47:16.854775807Z"), kMax);
+    EXPECT_EQ(pyx::parseIsoTime("1677-09-21T00:12:43.145224192Z"), kMin);
+    EXPECT_FALSE(pyx::parseIsoTime("2262-04-11T23:47:16.854775808Z", &refusal));
+    EXPECT_EQ(refusal, pyx::IsoTimeRefusal::OutOfRange);
+    EXPECT_FALSE(pyx::parseIsoTime("1677-09-21T00:12:43.145224191Z"));
+    EXPECT_EQ(pyx::isoTimeRange(),
+              "1677-09-21T00:12:43.145224192Z to 2262-04-11T23:47:16.854775807Z");
+}
+
+TEST(ExportCommand, ATimeOutOfRangeOrADateThatDoesNotExistIsRefusedWithOneLine) {
+    const TempDir dir;
+    const std::string file = dir.file("drive.pyxrec");
+    {
+        RecordingWriter writer(writerOptions(file));
+        writer.add(velk::kEventMetric, sampleEvent(0));
+    }
+    pyx::ExportRequest request;
+    request.file = file;
+    request.from = "9999-12-31";
+    Outcome run = exportOf(request);
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.err,
+              "pyxonctl export: --from '9999-12-31' is outside the times a recording can hold, "
+              "1677-09-21T00:12:43.145224192Z to 2262-04-11T23:47:16.854775807Z\n");
+    request.from.reset();
+    request.to = "2026-02-31";
+    run = exportOf(request);
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.err,
+              "pyxonctl export: --to '2026-02-31' is not a time; example: 2026-11-23T19:05:50Z "
+              "(UTC without a zone)\n");
 }
 
 TEST(CsvText, FieldsWithCommasQuotesOrLineBreaksAreQuotedAsRfc4180Has) {
@@ -337,6 +417,22 @@ TEST(ExportCommand, EachBadFileGivesOneLineNamingItAndANonZeroExit) {
     }
 }
 
+TEST(ExportCommand, AnOutputThatCannotBeWrittenIsSaidAndExitsNonZero) {
+    const TempDir dir;
+    const std::string file = dir.file("drive.pyxrec");
+    {
+        RecordingWriter writer(writerOptions(file));
+        for (int n = 0; n < 10; ++n) writer.add(velk::kEventMetric, sampleEvent(n));
+    }
+    pyx::ExportRequest request;
+    request.file = file;
+    std::ofstream full("/dev/full");
+    ASSERT_TRUE(full.is_open());
+    std::ostringstream err;
+    EXPECT_EQ(pyx::runExport(request, full, err), 1);
+    EXPECT_EQ(err.str(), "pyxonctl export: writing the output failed\n");
+}
+
 TEST(ExportCommand, ADamagedFileExportsWhatCanBeReadAndSaysHowMuch) {
     const TempDir dir;
     const std::string file = dir.file("cut.pyxrec");
@@ -459,21 +555,9 @@ TEST(ExportCommand, ARecordTheStoreRefusesIsSkippedWithOneLineAndCounted) {
 
 // Runs the built pyxonctl; stdout and stderr apart.
 Outcome program(const std::string& arguments) {
-    const TempDir dir;
-    const std::string errPath = dir.file("err.txt");
-    const std::string command =
-        std::string("'") + PYXONCTL_PATH + "' " + arguments + " 2> '" + errPath + "' < /dev/null";
-    Outcome run;
-    std::FILE* pipe = ::popen(command.c_str(), "r");
-    if (pipe == nullptr) return run;
-    char buffer[4096];
-    for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;)
-        run.out.append(buffer, n);
-    const int status = ::pclose(pipe);
-    run.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-    std::ifstream err(errPath);
-    run.err.assign(std::istreambuf_iterator<char>(err), std::istreambuf_iterator<char>());
-    return run;
+    const auto run =
+        pyx::test::ProgramRun::shell(std::string("'") + PYXONCTL_PATH + "' " + arguments);
+    return Outcome{run.exitCode, run.out, run.err};
 }
 
 TEST(RecordingPrograms, InfoExportAndReplayOfABadFileExitNonZeroWithOneLine) {
@@ -488,6 +572,37 @@ TEST(RecordingPrograms, InfoExportAndReplayOfABadFileExitNonZeroWithOneLine) {
         const Outcome replay = program("listen --source 'replay:" + file + "'");
         EXPECT_EQ(replay.status, 2);
         EXPECT_EQ(replay.err, "pyxonctl listen: --source replay: " + file + ": " + what + "\n");
+    }
+}
+
+TEST(RecordingPrograms, ListenOnADamagedRecordingEndsAndExitsNonZero) {
+    const TempDir dir;
+    const std::string file = dir.file("cut.pyxrec");
+    recordSimulatedDrive(file, 3000);
+    std::filesystem::resize_file(file, std::filesystem::file_size(file) / 2);
+    // --duration only bounds a run that would otherwise never end.
+    const Outcome replay =
+        program("listen --source 'replay:" + file + "' --speed 0 --duration 120");
+    EXPECT_EQ(replay.status, 1) << replay.err;
+    EXPECT_NE(replay.err.find("replay " + file + ": damaged "), std::string::npos) << replay.err;
+    EXPECT_NE(replay.err.find("; the replay stops here\n"), std::string::npos) << replay.err;
+    EXPECT_FALSE(linesOf(replay.out).empty());
+}
+
+TEST(RecordingPrograms, ExportToAFullDiskSaysSoAndExitsNonZero) {
+    const TempDir dir;
+    const std::string file = dir.file("drive.pyxrec");
+    {
+        RecordingWriter writer(writerOptions(file));
+        for (int n = 0; n < 100; ++n) writer.add(velk::kEventMetric, sampleEvent(n));
+    }
+    for (const char* format : {"jsonl", "csv"}) {
+        const Outcome run = program("export '" + file + "' --format " + format + " > /dev/full");
+        EXPECT_EQ(run.status, 1) << format;
+        // csv says first which of the sample records the store refused.
+        EXPECT_TRUE(run.err.ends_with("\npyxonctl export: writing the output failed\n") ||
+                    run.err == "pyxonctl export: writing the output failed\n")
+            << run.err;
     }
 }
 

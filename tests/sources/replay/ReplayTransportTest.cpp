@@ -30,6 +30,7 @@ using pyx::Dict;
 using pyx::Value;
 using pyx::recordings::RecordingWriter;
 using pyx::replay::ReplayTransport;
+using pyx::testing::recordingOptions;
 using pyx::testing::sampleEvent;
 using pyx::testing::sequenceOf;
 using pyx::testing::StreamEvent;
@@ -37,19 +38,10 @@ using pyx::testing::TempDir;
 
 const std::string kConfigPath = std::string(PYXON_RESOURCE_DIR) + "/oru_test_lte.deviceconfig";
 
-RecordingWriter::Options writerOptions(const std::string& file) {
-    RecordingWriter::Options options;
-    options.path = file;
-    options.session.programVersion = "0.1.0";
-    options.session.source = "sim";
-    options.session.host = "testhost";
-    return options;
-}
-
 // A recording of the numbered sample events 0..count-1, spaced by gap.
 void writeSamples(const std::string& file, int count,
                   std::chrono::milliseconds gap = std::chrono::milliseconds(0)) {
-    RecordingWriter writer(writerOptions(file));
+    RecordingWriter writer(recordingOptions(file));
     for (int n = 0; n < count; ++n) {
         if (n > 0 && gap.count() > 0) std::this_thread::sleep_for(gap);
         writer.add(velk::kEventMetric, sampleEvent(n));
@@ -128,7 +120,7 @@ TEST(Replay, RecordThenReplayHandsTheStoreTheSameRecordsInTheSameOrder) {
     pyx::MainQueue mainQueue;
 
     // Live: the simulated baseband, recorded on its way to the client.
-    auto writer = std::make_shared<RecordingWriter>(writerOptions(file));
+    auto writer = std::make_shared<RecordingWriter>(recordingOptions(file));
     pyx::sim::SimulatedBaseband::Options simOptions;
     simOptions.seed = 11;
     simOptions.speed = 200.0;
@@ -244,7 +236,10 @@ TEST(Replay, AtTheEndItSaysSoOnceAndHandsOutNothingMore) {
     ReplayTransport::Options options;
     options.file = file;
     options.speed = 0;
-    options.onEnd = [&] { ++ends; };
+    options.onEnd = [&](bool damaged) {
+        EXPECT_FALSE(damaged);
+        ++ends;
+    };
     ReplayTransport replay(options);
     replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
     Collector collector;
@@ -288,6 +283,34 @@ TEST(Replay, WithLoopItStartsAgainFromTheFirstEventAndSaysTheEndOnce) {
                             }),
               1);
     EXPECT_FALSE(replay.finished());
+}
+
+TEST(Replay, AnEmptyRecordingWithLoopIsOverAtOnceAndSaysSo) {
+    const pyx::CapturedLines log(pyx::systemLogSink());
+    const TempDir dir;
+    const std::string file = dir.file("empty.pyxrec");
+    writeSamples(file, 0);
+    std::atomic<int> ends{0};
+    ReplayTransport::Options options;
+    options.file = file;
+    options.speed = 0;
+    options.loop = true;
+    options.onEnd = [&](bool damaged) {
+        EXPECT_FALSE(damaged);
+        ++ends;
+    };
+    ReplayTransport replay(options);
+    replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+    Collector collector;
+    replay.startEvents(collector.sink());
+    ASSERT_TRUE(waitUntil([&] { return replay.finished(); }));
+    replay.stopEvents();
+    EXPECT_TRUE(collector.events().empty());
+    EXPECT_EQ(ends, 1);
+    const auto lines = log.lines();
+    EXPECT_EQ(std::count(lines.begin(), lines.end(),
+                         "replay " + file + ": the recording holds no events"),
+              1);
 }
 
 TEST(Replay, EventsFlowOnceAConfigurationIsPushedAndARestartGoesOnWhereItWas) {
@@ -338,19 +361,28 @@ TEST(Replay, ADamagedRecordingPlaysWhatCanBeReadThenSaysWhereItBrokeOff) {
     const TempDir dir;
     const std::string file = dir.file("cut.pyxrec");
     {
-        RecordingWriter writer(writerOptions(file));
+        RecordingWriter writer(recordingOptions(file));
         for (int n = 0; n < 3000; ++n) writer.add(velk::kEventMetric, sampleEvent(n, 40));
     }
     std::filesystem::resize_file(file, std::filesystem::file_size(file) / 2);
     const pyx::CapturedLines log(pyx::systemLogSink());
+    std::atomic<int> ends{0};
+    std::atomic<int> damagedEnds{0};
     ReplayTransport::Options options;
     options.file = file;
     options.speed = 0;
+    options.onEnd = [&](bool damaged) {
+        ++ends;
+        if (damaged) ++damagedEnds;
+    };
     ReplayTransport replay(options);
     replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
     Collector collector;
     replay.startEvents(collector.sink());
     ASSERT_TRUE(waitUntil([&] { return replay.finished(); }));
+    replay.stopEvents();
+    EXPECT_EQ(ends, 1);
+    EXPECT_EQ(damagedEnds, 1);
     const auto events = collector.events();
     ASSERT_GT(events.size(), 500u);
     ASSERT_LT(events.size(), 3000u);

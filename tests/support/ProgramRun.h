@@ -15,6 +15,8 @@ struct ProgramRun {
     // Runs args[0] (a path, or a name looked up in PATH) with the arguments that follow, and
     // waits for its end.
     static ProgramRun of(const std::vector<std::string>& args, const std::string& input = {});
+    // Runs a shell command line (pipes, redirections, quoting) the same way.
+    static ProgramRun shell(const std::string& commandLine, const std::string& input = {});
 };
 
 }  // namespace pyx::test

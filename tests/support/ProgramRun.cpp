@@ -1,4 +1,4 @@
-#include "ProgramRun.h"
+#include "tests/support/ProgramRun.h"
 
 #include <fcntl.h>
 #include <sys/wait.h>
@@ -57,6 +57,10 @@ ProgramRun ProgramRun::of(const std::vector<std::string>& args, const std::strin
     std::error_code ec;
     for (const auto& path : {inPath, outPath, errPath}) std::filesystem::remove(path, ec);
     return run;
+}
+
+ProgramRun ProgramRun::shell(const std::string& commandLine, const std::string& input) {
+    return of({"/bin/sh", "-c", commandLine}, input);
 }
 
 }  // namespace pyx::test
