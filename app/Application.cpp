@@ -4,6 +4,7 @@
 
 #include <csignal>
 #include <cstdint>
+#include <functional>
 #include <iostream>
 #include <optional>
 #include <string>
@@ -30,12 +31,7 @@ namespace {
 
 struct Options {
     bool headless = false;
-    std::string source = "sim";
-    std::uint64_t seed = 1;
-    double speed = 1.0;
-    bool loop = false;
-    std::optional<std::string> record;
-    bool append = false;
+    SourceArgs source;
     std::optional<std::string> screenshots;
     std::optional<std::string> chart;
 };
@@ -63,26 +59,7 @@ int runPyxon(int argc, char** argv) {
     Options options;
     cli.add_flag("--headless", options.headless,
                  "No window: print the system's lines as events arrive, until SIGINT or SIGTERM");
-    cli.add_option("--source", options.source,
-                   "Where events come from: sim, modem, modem:N or replay:FILE (see below)")
-        ->type_name("SOURCE")
-        ->capture_default_str();
-    cli.add_option("--seed", options.seed, "Seed of the simulated baseband's drive")
-        ->capture_default_str();
-    cli.add_option("--speed", options.speed,
-                   "Speed factor: the simulated baseband's events come this many times as often "
-                   "(> 0); a replay divides the recorded timing by it (0 = as fast as the store "
-                   "takes them)")
-        ->check(CLI::NonNegativeNumber)
-        ->capture_default_str();
-    cli.add_flag("--loop", options.loop, "Replay: start again at the end of the recording");
-    CLI::Option* record =
-        cli.add_option("--record", options.record,
-                       "Keep every event of this run in FILE (.pyxrec), raw and in order")
-            ->type_name("FILE");
-    cli.add_flag("--append", options.append,
-                 "With --record: add a new session to an existing recording")
-        ->needs(record);
+    options.source.addTo(cli);
     cli.add_option("--screenshots", options.screenshots,
                    "Render every screen and chart page to PNG files in this folder, then quit")
         ->type_name("DIR");
@@ -109,14 +86,6 @@ int runPyxon(int argc, char** argv) {
         std::cerr << "pyxon: " << e.what() << "\nRun with --help for more information.\n";
         return 2;
     }
-    std::optional<sources::SourceChoice> sourceChoice;
-    try {
-        sourceChoice = sources::parseSource(options.source);
-    } catch (const sources::SourceError& e) {
-        std::cerr << "pyxon: " << e.what() << "\n";
-        return 2;
-    }
-
 #ifdef PYXON_HAVE_WINDOW
     const bool window = !options.headless && (options.screenshots || displayAvailable());
     if (!options.headless && !window) systemLog("pyxon: no display available, running headless");
@@ -146,22 +115,21 @@ int runPyxon(int argc, char** argv) {
         }
     }
     if (options.screenshots && cli.get_option("--speed")->count() == 0)
-        options.speed = kScreenshotSpeed;
+        options.source.speed = kScreenshotSpeed;
 
-    std::optional<StopOnSignal> stopOnSignal;
-    if (!window) stopOnSignal.emplace(MainQueue::shared());
+    // SIGINT and SIGTERM end the program through its exit path below, the window's too (a
+    // Ctrl-C in its terminal, a logout), so that the source stops and a recording is closed.
+    std::function<void()> stop = [] { MainQueue::shared().stop(); };
+#ifdef PYXON_HAVE_WINDOW
+    if (window) stop = [] { MainQueue::shared().post(quitWindow); };
+#endif
+    const StopOnSignal stopOnSignal(std::move(stop));
 
     const RejectedRecords rejected(MainQueue::shared());
 
     std::optional<ProgramSource> source;
     try {
-        sources::SourceOptions sourceOptions;
-        sourceOptions.choice = *sourceChoice;
-        sourceOptions.seed = options.seed;
-        sourceOptions.speed = options.speed;
-        sourceOptions.loop = options.loop;
-        source.emplace(openProgramSource(std::move(sourceOptions), options.record, options.append,
-                                         PYXON_VERSION));
+        source.emplace(openProgramSource(options.source, PYXON_VERSION));
     } catch (const sources::SourceError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;

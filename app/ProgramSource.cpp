@@ -1,10 +1,33 @@
 #include "app/ProgramSource.h"
 
+#include <CLI/CLI.hpp>
+
 #include <utility>
 
 #include "baseband/velk/Client.h"
 
 namespace pyx {
+
+void SourceArgs::addTo(CLI::App& app) {
+    app.add_option("--source", source,
+                   "Where events come from: sim, modem, modem:N or replay:FILE (see below)")
+        ->type_name("SOURCE")
+        ->capture_default_str();
+    app.add_option("--seed", seed, "Seed of the simulated baseband's drive")->capture_default_str();
+    app.add_option("--speed", speed,
+                   "Speed factor: the simulated baseband's events come this many times as often "
+                   "(> 0); a replay divides the recorded timing by it (0 = as fast as the store "
+                   "takes them)")
+        ->check(CLI::NonNegativeNumber)
+        ->capture_default_str();
+    app.add_flag("--loop", loop, "Replay: start again at the end of the recording");
+    CLI::Option* recordOption =
+        app.add_option("--record", record,
+                       "Keep every event of this run in FILE (.pyxrec), raw and in order")
+            ->type_name("FILE");
+    app.add_flag("--append", append, "With --record: add a new session to an existing recording")
+        ->needs(recordOption);
+}
 
 ProgramSource::ProgramSource(std::shared_ptr<velk::client::Transport> transport,
                              std::shared_ptr<recordings::RecordingWriter> recording)
@@ -21,14 +44,20 @@ void ProgramSource::close() {
     recording_.reset();
 }
 
-ProgramSource openProgramSource(sources::SourceOptions options,
-                                const std::optional<std::string>& record, bool append,
-                                const std::string& programVersion) {
+ProgramSource openProgramSource(const SourceArgs& args, const std::string& programVersion,
+                                std::function<void(bool damaged)> onEnd) {
+    sources::SourceOptions options;
+    options.choice = sources::parseSource(args.source);
+    options.seed = args.seed;
+    options.speed = args.speed;
+    options.loop = args.loop;
+    options.onEnd = std::move(onEnd);
     std::shared_ptr<velk::client::Transport> transport = sources::makeTransport(options);
     std::shared_ptr<recordings::RecordingWriter> recording;
-    if (record) {
+    if (args.record) {
         auto recorded = sources::recordSource(
-            std::move(transport), options, sources::RecordOptions{*record, append, programVersion});
+            std::move(transport), options,
+            sources::RecordOptions{*args.record, args.append, programVersion});
         transport = std::move(recorded.transport);
         recording = std::move(recorded.writer);
     }

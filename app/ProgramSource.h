@@ -5,13 +5,33 @@
 // and says what it holds.
 #pragma once
 
+#include <cstdint>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
 
 #include "sources/Source.h"
 
+namespace CLI {
+class App;
+}
+
 namespace pyx {
+
+// The options that choose a program's source and record it, the same in pyxon and pyxonctl
+// listen.
+struct SourceArgs {
+    std::string source = "sim";
+    std::uint64_t seed = 1;
+    double speed = 1.0;
+    bool loop = false;
+    std::optional<std::string> record;
+    bool append = false;
+
+    // Adds --source, --seed, --speed, --loop, --record and --append to app.
+    void addTo(CLI::App& app);
+};
 
 class ProgramSource {
   public:
@@ -31,9 +51,9 @@ class ProgramSource {
     }
 
   private:
-    friend ProgramSource openProgramSource(sources::SourceOptions options,
-                                           const std::optional<std::string>& record, bool append,
-                                           const std::string& programVersion);
+    friend ProgramSource openProgramSource(const SourceArgs& args,
+                                           const std::string& programVersion,
+                                           std::function<void(bool damaged)> onEnd);
     ProgramSource(std::shared_ptr<velk::client::Transport> transport,
                   std::shared_ptr<recordings::RecordingWriter> recording);
 
@@ -41,10 +61,11 @@ class ProgramSource {
     std::shared_ptr<recordings::RecordingWriter> recording_;  // for --record
 };
 
-// Opens the source and sets it as velk's transport factory. record: the recording's file, with
-// append for --append. Throws sources::SourceError with one line saying what is wrong.
-[[nodiscard]] ProgramSource openProgramSource(sources::SourceOptions options,
-                                              const std::optional<std::string>& record, bool append,
-                                              const std::string& programVersion);
+// Opens the source args name and sets it as velk's transport factory. onEnd: called when a
+// replay without --loop reaches the end of its recording (see SourceOptions::onEnd). Throws
+// sources::SourceError with one line saying what is wrong.
+[[nodiscard]] ProgramSource openProgramSource(const SourceArgs& args,
+                                              const std::string& programVersion,
+                                              std::function<void(bool damaged)> onEnd = {});
 
 }  // namespace pyx

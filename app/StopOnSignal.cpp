@@ -2,19 +2,19 @@
 
 #include <pthread.h>
 
-#include "core/MainQueue.h"
+#include <utility>
 
 namespace pyx {
 
-StopOnSignal::StopOnSignal(MainQueue& queue) {
+StopOnSignal::StopOnSignal(std::function<void()> onSignal) {
     sigemptyset(&signals_);
     sigaddset(&signals_, SIGINT);
     sigaddset(&signals_, SIGTERM);
     pthread_sigmask(SIG_BLOCK, &signals_, nullptr);
-    waiter_ = std::thread([this, &queue] {
+    waiter_ = std::thread([this, onSignal = std::move(onSignal)] {
         int signal = 0;
         sigwait(&signals_, &signal);
-        if (!done_) queue.stop();
+        if (!done_) onSignal();
     });
 }
 

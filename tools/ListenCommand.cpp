@@ -25,12 +25,7 @@ namespace pyx {
 namespace {
 
 struct ListenOptions {
-    std::string source = "sim";
-    std::uint64_t seed = 1;
-    double speed = 1.0;
-    bool loop = false;
-    std::optional<std::string> record;
-    bool append = false;
+    SourceArgs source;
     std::optional<double> duration;
     std::optional<std::uint64_t> count;
 };
@@ -68,39 +63,26 @@ class EventPrinter : public VelkWrapperDelegate {
 };
 
 int runListen(const ListenOptions& options) {
-    std::optional<sources::SourceChoice> choice;
-    try {
-        choice = sources::parseSource(options.source);
-    } catch (const sources::SourceError& e) {
-        std::cerr << "pyxonctl listen: " << e.what() << "\n";
-        return 2;
-    }
     // stdout carries only records; the start-up lines go to stderr.
     standardOutputSink().redirect(stderr);
     std::signal(SIGPIPE, SIG_IGN);
 
     MainQueue& mainQueue = MainQueue::shared();
     mainQueue.claimCurrentThread();
-    const StopOnSignal stopOnSignal(mainQueue);
+    const StopOnSignal stopOnSignal([&mainQueue] { mainQueue.stop(); });
 
     // Set on the replay's thread, read once the main queue has stopped.
     std::atomic<bool> damaged{false};
     std::optional<ProgramSource> source;
     try {
-        sources::SourceOptions sourceOptions;
-        sourceOptions.choice = *choice;
-        sourceOptions.seed = options.seed;
-        sourceOptions.speed = options.speed;
-        sourceOptions.loop = options.loop;
         // A replay that ends ends the run, once the events before the end are printed: the
         // stop goes the way the events go, through the serial queue, then the main queue.
-        sourceOptions.onEnd = [&mainQueue, &damaged](bool isDamaged) {
-            if (isDamaged) damaged = true;
-            VelkWrapper::queue().post(
-                [&mainQueue] { mainQueue.post([&mainQueue] { mainQueue.stop(); }); });
-        };
-        source.emplace(openProgramSource(std::move(sourceOptions), options.record, options.append,
-                                         PYXON_VERSION));
+        source.emplace(openProgramSource(
+            options.source, PYXON_VERSION, [&mainQueue, &damaged](bool isDamaged) {
+                if (isDamaged) damaged = true;
+                VelkWrapper::queue().post(
+                    [&mainQueue] { mainQueue.post([&mainQueue] { mainQueue.stop(); }); });
+            }));
     } catch (const sources::SourceError& e) {
         std::cerr << "pyxonctl listen: " << e.what() << "\n";
         return 2;
@@ -137,28 +119,7 @@ Subcommand addListenCommand(CLI::App& pyxonctl) {
         "listen",
         "Start a source the way the viewer does and print every metric event as one JSON line "
         "({\"kKeyMetricID\": N, \"kKeyPayload\": \"hex\"}), the format decode and screen read");
-    listen->add_option("--source", options->source, "sim, modem, modem:N or replay:FILE")
-        ->type_name("SOURCE")
-        ->capture_default_str();
-    listen->add_option("--seed", options->seed, "Seed of the simulated baseband's drive")
-        ->capture_default_str();
-    listen
-        ->add_option("--speed", options->speed,
-                     "Speed factor: the simulated baseband's events come this many times as "
-                     "often (> 0); a replay divides the recorded timing by it (0 = as fast as "
-                     "they are taken)")
-        ->check(CLI::NonNegativeNumber)
-        ->capture_default_str();
-    listen->add_flag("--loop", options->loop, "Replay: start again at the end of the recording");
-    CLI::Option* record =
-        listen
-            ->add_option("--record", options->record,
-                         "Keep every event of this run in FILE (.pyxrec), raw and in order")
-            ->type_name("FILE");
-    listen
-        ->add_flag("--append", options->append,
-                   "With --record: add a new session to an existing recording")
-        ->needs(record);
+    options->source.addTo(*listen);
     listen->add_option("--duration", options->duration, "Stop after this many seconds")
         ->type_name("SECONDS")
         ->check(CLI::NonNegativeNumber);

@@ -40,6 +40,10 @@ bool displayAvailable() {
     return environmentSet("DISPLAY") || environmentSet("WAYLAND_DISPLAY") || offscreenPlatform();
 }
 
+void quitWindow() {
+    QCoreApplication::exit(0);
+}
+
 int runWindow(int& argc, char** argv, const WindowOptions& options,
               std::function<void()> rootViewDidLoad) {
     // Screenshots need no screen: without a display they are rendered off screen.

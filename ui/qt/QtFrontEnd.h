@@ -24,6 +24,10 @@ struct WindowOptions {
 int runWindow(int& argc, char** argv, const WindowOptions& options,
               std::function<void()> rootViewDidLoad);
 
+// Ends the window's event loop with status 0; runWindow then returns. Run it on the main queue
+// (the event loop drains it), e.g. when SIGINT or SIGTERM arrives.
+void quitWindow();
+
 // False when there is neither an X11 nor a Wayland display and the platform is not offscreen.
 bool displayAvailable();
 
