@@ -1,8 +1,10 @@
 // NAS, bearer and SIM reports of the drive: the subscriber's identities as the network and the
 // SIM card hold them.
+#include <algorithm>
 #include <array>
 #include <memory>
 #include <string>
+#include <string_view>
 
 #include "messages/Messages.h"
 #include "sources/sim/Identities.h"
@@ -188,10 +190,10 @@ Bytes simCardFiles(const DriveState& s, std::uint64_t timestamp, Random&) {
     m.addEfList(elementaryFile(kEfIccid, encodeIccid(sub.iccid)));
     m.addEfList(elementaryFile(kEfImsi, encodeImsi(sub.imsi, true)));
 
-    Bytes spn{0x01};  // display condition, then the name, F-padded to 16 characters
-    const std::string name = "Pyxon Test";
-    spn.insert(spn.end(), name.begin(), name.end());
-    spn.resize(17, 0xFF);
+    Bytes spn(17, 0xFF);  // display condition, then the name, F-padded to 16 characters
+    spn[0] = 0x01;
+    const std::string_view name = "Pyxon Test";
+    std::copy(name.begin(), name.end(), spn.begin() + 1);
     m.addEfList(elementaryFile(0x6F46, std::move(spn)));  // SPN
 
     m.addEfList(elementaryFile(kEfAd, adContent(sub.mncDigits)));
