@@ -212,7 +212,12 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
 
 }  // namespace
 
-bool readMessage(const MessageDescriptor& d, void* message, PBDataReader& reader) {
+// Starts on a cache-line boundary. The reader loop's hot path is a handful of short blocks
+// spread over a few hundred bytes; with the default 16-byte function alignment, where they
+// fall against 64-byte lines depended on how much code the linker happened to place before
+// this function, and the typed decode ran some 5-8 % slower in the unlucky placements.
+[[gnu::aligned(64)]] bool readMessage(const MessageDescriptor& d, void* message,
+                                      PBDataReader& reader) {
     // Plain values are read on local copies of the cursor and of the presence bits (so that
     // storing a field does not make the compiler reload the reader); the reader is brought up to
     // date around everything that goes through it.
