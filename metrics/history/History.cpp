@@ -148,16 +148,18 @@ void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
             for (std::size_t i = 0; i < kept; ++i) {
                 const Dict& entry = *strongest_[i].second;
                 if (const auto value = numberAt(entry, q.field))
-                    addEntry(quantity, entry, *value, timeMs);
+                    addEntry(quantity, entry, *value, timeMs, strongest_[i].first);
             }
             return;
         }
     }
 }
 
-void History::addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs) {
+void History::addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs,
+                       float rank) {
     const Quantity& q = historyQuantities()[quantity];
-    seriesFor(SeriesKey{quantity, keyAt(entry, q.keyA), keyAt(entry, q.keyB)}).add(timeMs, value);
+    seriesFor(SeriesKey{quantity, keyAt(entry, q.keyA), keyAt(entry, q.keyB)})
+        .add(timeMs, value, rank);
 }
 
 Series& History::singleFor(std::size_t quantity) {
@@ -197,24 +199,37 @@ Series& History::seriesFor(SeriesKey key) {
 
 std::vector<const Series*> History::seriesOf(Chart chart, double fromMs) const {
     std::vector<const Series*> out;
-    for (const auto& series : series_)
-        if (series->quantity().chart == chart && !series->points().empty() &&
-            series->points().newest().timeMs >= fromMs)
-            out.push_back(series.get());
-    // Per-entry quantities ranked by strength: the strongest last values first, and no more
-    // of them than an arrival keeps.
-    std::sort(out.begin(), out.end(), [](const Series* x, const Series* y) {
+    // The newest slot any ranked line of the chart was heard in.
+    std::int64_t newestSlot = std::numeric_limits<std::int64_t>::min();
+    for (const auto& series : series_) {
+        if (series->quantity().chart != chart || series->points().empty() ||
+            series->points().newest().timeMs < fromMs)
+            continue;
+        out.push_back(series.get());
+        if (series->quantity().pick == Pick::Strongest)
+            newestSlot = std::max(newestSlot, series->points().newest().slot);
+    }
+    // Lines ranked by strength: those heard in the newest slot or the one before come first,
+    // then the rest; each group strongest first by the value the entries were ranked by when
+    // last heard. The ranking value is the same for every quantity of an entry, so every
+    // panel of the chart lists the same entries in the same order.
+    const auto current = [newestSlot](const Series* s) {
+        return s->points().newest().slot >= newestSlot - 1;
+    };
+    std::sort(out.begin(), out.end(), [&current](const Series* x, const Series* y) {
         const SeriesKey& a = x->key();
         const SeriesKey& b = y->key();
         if (a.quantity != b.quantity) return a.quantity < b.quantity;
         if (x->quantity().pick == Pick::Strongest) {
-            const float lx = x->points().newest().last;
-            const float ly = y->points().newest().last;
-            if (lx != ly) return lx > ly;
+            const bool cx = current(x);
+            const bool cy = current(y);
+            if (cx != cy) return cx;
+            if (x->rank() != y->rank()) return x->rank() > y->rank();
         }
         if (a.a != b.a) return a.a < b.a;
         return a.b < b.b;
     });
+    // No more of them than an arrival keeps.
     std::vector<const Series*> kept;
     kept.reserve(out.size());
     std::size_t ofQuantity = 0;

@@ -50,8 +50,9 @@ class History {
                 std::optional<double> eventTimeMs);
 
     // The series of a chart with a point at fromMs or later, in the order of the quantities
-    // and then of their entries' keys; of a quantity ranked by strength, the strongest eight
-    // by their latest value, strongest first.
+    // and then of their entries' keys. Of a quantity ranked by strength, eight: those heard
+    // in the chart's newest two slots before the others, each group strongest first by the
+    // ranking value they were last heard with; every quantity of the chart in the same order.
     [[nodiscard]] std::vector<const Series*> seriesOf(Chart chart, double fromMs) const;
     // Whether any quantity of the chart is read from this kind.
     [[nodiscard]] static bool feeds(Chart chart, MetricValidator::DictionaryProperty property);
@@ -75,7 +76,8 @@ class History {
     [[nodiscard]] double timeOf(std::optional<double> eventTimeMs) const;
     void startSession(double timeMs);
     void add(std::size_t quantity, const Dict& stored, double timeMs);
-    void addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs);
+    void addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs,
+                  float rank = 0);
     Series& seriesFor(SeriesKey key);
     Series& singleFor(std::size_t quantity);
 

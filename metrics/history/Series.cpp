@@ -16,7 +16,7 @@ const Quantity& Series::quantity() const {
 
 void Series::rekey(SeriesKey key) {
     key_ = key;
-    ring_.clear();
+    clear();
     describe();
 }
 

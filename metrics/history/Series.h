@@ -33,10 +33,20 @@ class Series {
     [[nodiscard]] std::string label() const;
     [[nodiscard]] const SeriesRing& points() const { return ring_; }
 
+    // What the entry was ranked by when its latest point was added (a neighbour's RSRP for
+    // its RSRQ line too); 0 for a quantity not ranked by strength.
+    [[nodiscard]] float rank() const { return rank_; }
+
     // Reuses the series for another key; its points are dropped.
     void rekey(SeriesKey key);
-    void add(double timeMs, float value) { ring_.add(timeMs, value); }
-    void clear() { ring_.clear(); }
+    void add(double timeMs, float value, float rank = 0) {
+        ring_.add(timeMs, value);
+        rank_ = rank;
+    }
+    void clear() {
+        ring_.clear();
+        rank_ = 0;
+    }
 
   private:
     void describe();
@@ -44,6 +54,7 @@ class Series {
     SeriesKey key_;
     std::string entity_;
     SeriesRing ring_;
+    float rank_ = 0;
 };
 
 }  // namespace pyx

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "metrics/history/History.h"
@@ -31,6 +32,16 @@ Dict lteNeighbours(const std::vector<std::pair<int, int>>& pciAndRsrp) {
                                  {"nbr_phys_cell_id", Value(std::int64_t{pci})},
                                  {"nbr_rsrp", Value(std::int64_t{rsrp})},
                                  {"nbr_rsrq", Value(-10.5F)}}));
+    return Dict{{"meas_nbr_eutra", Value(std::move(list))}};
+}
+
+Dict lteNeighboursWithRsrq(const std::vector<std::tuple<int, int, float>>& pciRsrpAndRsrq) {
+    Array list;
+    for (const auto& [pci, rsrp, rsrq] : pciRsrpAndRsrq)
+        list.emplace_back(entry({{"nbr_earfcn", Value(std::int64_t{6300})},
+                                 {"nbr_phys_cell_id", Value(std::int64_t{pci})},
+                                 {"nbr_rsrp", Value(std::int64_t{rsrp})},
+                                 {"nbr_rsrq", Value(rsrq)}}));
     return Dict{{"meas_nbr_eutra", Value(std::move(list))}};
 }
 
@@ -160,7 +171,8 @@ TEST(History, OnlyTheStrongestEightNeighboursAreKeptAndShownStrongestFirst) {
     EXPECT_EQ(unitText(series[8]->quantity().unit), "dB");
     EXPECT_EQ(history.seriesCount(), 16U);
 
-    // Later the weak ones rise: the chart shows the eight strongest by their latest value.
+    // Later the weak ones rise and are heard alone: they come first, then the strongest of
+    // those heard before.
     std::vector<std::pair<int, int>> risen;
     for (int pci = 0; pci < 4; ++pci) risen.emplace_back(pci, -60 - pci);
     history.record(P::myLTEIntraRatMeasDict, lteNeighbours(risen), kStart + 10'000);
@@ -169,6 +181,57 @@ TEST(History, OnlyTheStrongestEightNeighboursAreKeptAndShownStrongestFirst) {
     EXPECT_EQ(now[3]->label(), "6300/3");
     EXPECT_EQ(now[4]->label(), "6300/11");
     EXPECT_EQ(now.size(), 16U);
+}
+
+TEST(History, EveryPanelOfNeighboursListsTheSameCellsInTheOrderOfTheirRanking) {
+    History history;
+    // The stronger the RSRP, the weaker the RSRQ.
+    std::vector<std::tuple<int, int, float>> neighbours;
+    for (int pci = 0; pci < 10; ++pci)
+        neighbours.emplace_back(pci, -120 + 3 * pci, -3.0F - static_cast<float>(pci));
+    history.record(P::myLTEIntraRatMeasDict, lteNeighboursWithRsrq(neighbours), kStart);
+    const auto series = history.seriesOf(Chart::LteNeighbours, 0);
+    ASSERT_EQ(series.size(), 16U);
+    const std::vector<std::string> order{"6300/9", "6300/8", "6300/7", "6300/6",
+                                         "6300/5", "6300/4", "6300/3", "6300/2"};
+    const std::vector<const Series*> rsrp(series.begin(), series.begin() + 8);
+    const std::vector<const Series*> rsrq(series.begin() + 8, series.end());
+    EXPECT_EQ(labels(rsrp), order);
+    EXPECT_EQ(labels(rsrq), order);
+    EXPECT_EQ(rsrq[0]->quantity().name, "RSRQ");
+    EXPECT_EQ(rsrq[0]->points().newest().last, -12.0F);
+    EXPECT_EQ(rsrq[0]->rank(), -93.0F);
+}
+
+TEST(History, ANeighbourHeardNowComesBeforeAStrongerOneHeardLongAgo) {
+    History history;
+    history.record(P::myLTEIntraRatMeasDict, lteNeighboursWithRsrq({{7, -60, -5.0F}}), kStart);
+    for (int second = 1; second <= 120; ++second)
+        history.record(P::myLTEIntraRatMeasDict, lteNeighboursWithRsrq({{1, -110, -18.0F}}),
+                       kStart + second * 1000.0);
+    const auto series = history.seriesOf(Chart::LteNeighbours, 0);
+    EXPECT_EQ(labels(series), (std::vector<std::string>{"6300/1", "6300/7", "6300/1", "6300/7"}));
+
+    // Heard again: the stronger one leads.
+    history.record(P::myLTEIntraRatMeasDict, lteNeighboursWithRsrq({{7, -61, -5.0F}}),
+                   kStart + 121'000);
+    EXPECT_EQ(labels(history.seriesOf(Chart::LteNeighbours, 0)),
+              (std::vector<std::string>{"6300/7", "6300/1", "6300/7", "6300/1"}));
+}
+
+TEST(History, OnlyEightNeighboursAreShownThoseHeardNowFirst) {
+    History history;
+    std::vector<std::tuple<int, int, float>> strong;
+    for (int pci = 0; pci < 8; ++pci) strong.emplace_back(pci, -60 - pci, -5.0F);
+    history.record(P::myLTEIntraRatMeasDict, lteNeighboursWithRsrq(strong), kStart);
+    history.record(P::myLTEIntraRatMeasDict, lteNeighboursWithRsrq({{20, -115, -19.0F}}),
+                   kStart + 60'000);
+    const auto series = history.seriesOf(Chart::LteNeighbours, 0);
+    ASSERT_EQ(series.size(), 16U);
+    EXPECT_EQ(series[0]->label(), "6300/20");
+    EXPECT_EQ(series[1]->label(), "6300/0");
+    EXPECT_EQ(series[7]->label(), "6300/6");  // the weakest of the earlier ones is left out
+    EXPECT_EQ(series[8]->label(), "6300/20");
 }
 
 TEST(History, NeighboursThatComeAndGoUseABoundedNumberOfSeries) {
