@@ -82,10 +82,15 @@ double History::timeOf(std::optional<double> eventTimeMs) const {
     return clock_();
 }
 
+void History::raiseAllRevisions() {
+    for (std::uint64_t& revision : revisions_) ++revision;
+}
+
 void History::startSession(double timeMs) {
     for (const auto& series : series_) series->clear();
     newestMs_ = timeMs;
     ++session_;
+    raiseAllRevisions();
 }
 
 void History::record(MetricValidator::DictionaryProperty property, const Dict& stored,
@@ -93,48 +98,59 @@ void History::record(MetricValidator::DictionaryProperty property, const Dict& s
     const auto& read = byProperty_[static_cast<std::size_t>(property)];
     if (read.empty()) return;
     const double timeMs = timeOf(eventTimeMs);
-    ++revision_;
-    if (newestMs_ && timeMs + limits_.backwardsToleranceMs < *newestMs_)
-        startSession(timeMs);
-    else if (!newestMs_ || timeMs > *newestMs_)
+    if (!newestMs_) {
+        // Every chart now has a time to show its window up to, points or not.
         newestMs_ = timeMs;
-    for (const std::size_t quantity : read) add(quantity, stored, timeMs);
+        raiseAllRevisions();
+    } else if (timeMs + limits_.backwardsToleranceMs < *newestMs_) {
+        startSession(timeMs);
+    } else if (timeMs > *newestMs_) {
+        newestMs_ = timeMs;
+    }
+    for (const std::size_t quantity : read)
+        if (add(quantity, stored, timeMs))
+            ++revisions_[static_cast<std::size_t>(historyQuantities()[quantity].chart)];
 }
 
-void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
+bool History::add(std::size_t quantity, const Dict& stored, double timeMs) {
     const Quantity& q = historyQuantities()[quantity];
     switch (q.pick) {
         case Pick::Field: {
             const Dict* holder = &stored;
             if (!q.container.empty()) {
                 const Value* nested = stored.find(q.container);
-                if (nested == nullptr || !nested->isDict()) return;
+                if (nested == nullptr || !nested->isDict()) return false;
                 holder = &nested->asDict();
             }
-            if (const auto value = numberAt(*holder, q.field, q.convertedAs))
-                singleFor(quantity).add(timeMs, *value);
-            return;
+            const auto value = numberAt(*holder, q.field, q.convertedAs);
+            if (!value) return false;
+            singleFor(quantity).add(timeMs, *value);
+            return true;
         }
         case Pick::FirstEntry: {
             const Array* list = listAt(stored, q.container);
-            if (list == nullptr || list->empty() || !list->front().isDict()) return;
-            if (const auto value = numberAt(list->front().asDict(), q.field))
-                singleFor(quantity).add(timeMs, *value);
-            return;
+            if (list == nullptr || list->empty() || !list->front().isDict()) return false;
+            const auto value = numberAt(list->front().asDict(), q.field);
+            if (!value) return false;
+            singleFor(quantity).add(timeMs, *value);
+            return true;
         }
         case Pick::EachEntry: {
             const Array* list = listAt(stored, q.container);
-            if (list == nullptr) return;
+            if (list == nullptr) return false;
+            bool added = false;
             for (const Value& entry : *list) {
                 if (!entry.isDict()) continue;
-                if (const auto value = numberAt(entry.asDict(), q.field))
+                if (const auto value = numberAt(entry.asDict(), q.field)) {
                     addEntry(quantity, entry.asDict(), *value, timeMs);
+                    added = true;
+                }
             }
-            return;
+            return added;
         }
         case Pick::Strongest: {
             const Array* list = listAt(stored, q.container);
-            if (list == nullptr) return;
+            if (list == nullptr) return false;
             strongest_.clear();
             for (const Value& entry : *list) {
                 if (!entry.isDict()) continue;
@@ -145,14 +161,18 @@ void History::add(std::size_t quantity, const Dict& stored, double timeMs) {
             std::partial_sort(strongest_.begin(), strongest_.begin() + static_cast<long>(kept),
                               strongest_.end(),
                               [](const auto& x, const auto& y) { return x.first > y.first; });
+            bool added = false;
             for (std::size_t i = 0; i < kept; ++i) {
                 const Dict& entry = *strongest_[i].second;
-                if (const auto value = numberAt(entry, q.field))
+                if (const auto value = numberAt(entry, q.field)) {
                     addEntry(quantity, entry, *value, timeMs, strongest_[i].first);
+                    added = true;
+                }
             }
-            return;
+            return added;
         }
     }
+    return false;
 }
 
 void History::addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs,

@@ -13,6 +13,7 @@
 // Like the store, it belongs to the main thread.
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <functional>
@@ -61,8 +62,11 @@ class History {
     [[nodiscard]] std::optional<double> newestMs() const { return newestMs_; }
     // Counts the times the history started over because time went backwards.
     [[nodiscard]] std::uint32_t session() const { return session_; }
-    // Changes whenever a point is added: readers redraw only when it has.
-    [[nodiscard]] std::uint64_t revision() const { return revision_; }
+    // Changes whenever a point of the chart is added, a session starts or the first time of
+    // the history is seen: readers redraw only when it has.
+    [[nodiscard]] std::uint64_t revision(Chart chart) const {
+        return revisions_[static_cast<std::size_t>(chart)];
+    }
     [[nodiscard]] std::size_t seriesCount() const { return series_.size(); }
     [[nodiscard]] const Limits& limits() const { return limits_; }
 
@@ -75,7 +79,9 @@ class History {
 
     [[nodiscard]] double timeOf(std::optional<double> eventTimeMs) const;
     void startSession(double timeMs);
-    void add(std::size_t quantity, const Dict& stored, double timeMs);
+    void raiseAllRevisions();
+    // Whether a point was added.
+    bool add(std::size_t quantity, const Dict& stored, double timeMs);
     void addEntry(std::size_t quantity, const Dict& entry, float value, double timeMs,
                   float rank = 0);
     Series& seriesFor(SeriesKey key);
@@ -92,7 +98,7 @@ class History {
     std::vector<std::pair<float, const Dict*>> strongest_;  // scratch for the ranking
     std::optional<double> newestMs_;
     std::uint32_t session_ = 0;
-    std::uint64_t revision_ = 0;
+    std::array<std::uint64_t, kCharts.size()> revisions_{};
 };
 
 }  // namespace pyx

@@ -272,6 +272,42 @@ TEST(History, TimeGoingBackwardsStartsANewSession) {
     EXPECT_EQ(history.seriesOf(Chart::GsmServing, 0)[0]->points().size(), 2U);
 }
 
+Dict lteTxPower(int pusch) {
+    Array info;
+    info.emplace_back(entry({{"pusch_tx_power", Value(std::int64_t{pusch})}}));
+    return Dict{{"tx_power_info", Value(std::move(info))}};
+}
+
+TEST(History, AChartsRevisionMovesOnlyWhenAPointOfThatChartIsAdded) {
+    History history;
+    history.record(P::myGSMIdleScellMeasDict, gsmIdle(-80), kStart);
+    const auto gsm = history.revision(Chart::GsmServing);
+    const auto lte = history.revision(Chart::LteServing);
+    for (int second = 1; second <= 5; ++second)
+        history.record(P::myLTETxPowerDict, lteTxPower(10 + second), kStart + second * 1000.0);
+    EXPECT_EQ(history.revision(Chart::GsmServing), gsm);
+    EXPECT_NE(history.revision(Chart::LteServing), lte);
+
+    // A GSM arrival without a charted value adds no point either.
+    history.record(P::myGSMIdleScellMeasDict, Dict{{"scell_arfcn", Value(std::int64_t{62})}},
+                   kStart + 6000);
+    EXPECT_EQ(history.revision(Chart::GsmServing), gsm);
+    history.record(P::myGSMIdleScellMeasDict, gsmIdle(-81), kStart + 7000);
+    EXPECT_NE(history.revision(Chart::GsmServing), gsm);
+}
+
+TEST(History, EveryChartsRevisionMovesWhenTheHistoryStartsOrStartsOver) {
+    History history;
+    const auto umts = history.revision(Chart::UmtsNeighbours);
+    history.record(P::myGSMIdleScellMeasDict, gsmIdle(-80), kStart);
+    const auto started = history.revision(Chart::UmtsNeighbours);
+    EXPECT_NE(started, umts);  // the charts' window now ends at a time
+    history.record(P::myGSMIdleScellMeasDict, gsmIdle(-80), kStart + 2000);
+    EXPECT_EQ(history.revision(Chart::UmtsNeighbours), started);
+    history.record(P::myGSMIdleScellMeasDict, gsmIdle(-70), kStart - 60'000);
+    EXPECT_NE(history.revision(Chart::UmtsNeighbours), started);
+}
+
 TEST(History, KindsWithoutQuantitiesAndMissingFieldsAddNothing) {
     History history;
     history.record(P::myLTERRCStateDict, Dict{{"rrc_state", Value(std::int64_t{1})}}, kStart);

@@ -98,16 +98,13 @@ void ChartModel::fill(int panel, int index, QObject* series) const {
 }
 
 void ChartModel::refresh() {
-    if (read_ && history_->revision() == readRevision_ && history_->session() == readSession_)
-        return;
+    if (history_->revision(chart_) == readRevision_) return;
     rebuild();
     emit changed();
 }
 
 void ChartModel::rebuild() {
-    read_ = true;
-    readRevision_ = history_->revision();
-    readSession_ = history_->session();
+    readRevision_ = history_->revision(chart_);
     panels_.clear();
     toMs_ = history_->newestMs().value_or(0);
     fromMs_ = toMs_ - windowMinutes_ * 60'000.0;

@@ -1,7 +1,7 @@
 // A chart page's contents for Qt Quick: the history of one chart over the chosen window, as
 // one panel per unit (dBm, dB) holding the lines of that unit, all over one time axis. The
 // page asks it to refresh (at most once a second while it is shown); a refresh reads the
-// history only when points were added or the window changed.
+// history only when points were added to this chart (or the history started over).
 #pragma once
 
 #include <QList>
@@ -10,6 +10,7 @@
 #include <QString>
 #include <QStringList>
 
+#include <cstdint>
 #include <memory>
 #include <vector>
 
@@ -71,8 +72,8 @@ class ChartModel : public QObject {
     // Puts those points into a line series of the chart view (replacing its points).
     Q_INVOKABLE void fill(int panel, int segment, QObject* series) const;
 
-    // Reads the history again if points were added or the window changed; emits changed
-    // when it did.
+    // Reads the history again if points were added to the chart since it was last read;
+    // emits changed when it did.
     Q_INVOKABLE void refresh();
 
   signals:
@@ -99,9 +100,7 @@ class ChartModel : public QObject {
     QString missingText_;
     double fromMs_ = 0;
     double toMs_ = 0;
-    bool read_ = false;
-    std::uint64_t readRevision_ = 0;
-    std::uint32_t readSession_ = 0;
+    std::uint64_t readRevision_ = 0;  // the chart's revision of the history last read
 };
 
 }  // namespace pyx::qt
