@@ -27,12 +27,6 @@ void FirstLevelViewController::prepareForSegue(TableController& destination,
     secondLevel->setSeguedThroughRow(sender->text);
 }
 
-void FirstLevelViewController::prepareSecondLevel(SecondLevelViewController& destination,
-                                                  int row) const {
-    const Cell tapped = cellForRowAtIndexPath(0, row);
-    prepareForSegue(destination, &tapped);
-}
-
 std::optional<Destination> FirstLevelViewController::open(const Cell& tapped) const {
     auto category = std::make_shared<SecondLevelViewController>(*myMetricValidator_);
     prepareForSegue(*category, &tapped);

@@ -12,8 +12,6 @@
 
 namespace pyx {
 
-class SecondLevelViewController;
-
 class FirstLevelViewController : public MenuController {
   public:
     // store: handed on to the screens that follow; this menu does not read it.
@@ -36,8 +34,6 @@ class FirstLevelViewController : public MenuController {
     // from a cell). Only a second-level screen reached from a cell receives this menu's group
     // as firstSelection and the cell's text as seguedThroughRow; anything else gets nothing.
     void prepareForSegue(TableController& destination, const Cell* sender) const;
-    // The tap on row: hands destination the group and that row's category.
-    void prepareSecondLevel(SecondLevelViewController& destination, int row) const;
 
     // The category screen of the pair (group, tapped category), titled by the category.
     [[nodiscard]] std::optional<Destination> open(const Cell& tapped) const override;

@@ -18,11 +18,6 @@ void PyxViewController::prepareForSegue(TableController& destination, const Cell
     firstLevel->setSeguedThroughRow(sender->text);
 }
 
-void PyxViewController::prepareFirstLevel(FirstLevelViewController& destination, int row) const {
-    const Cell tapped = cellForRowAtIndexPath(0, row);
-    prepareForSegue(destination, &tapped);
-}
-
 std::optional<Destination> PyxViewController::open(const Cell& tapped) const {
     auto menu = std::make_shared<FirstLevelViewController>(*store_);
     prepareForSegue(*menu, &tapped);

@@ -11,8 +11,6 @@
 
 namespace pyx {
 
-class FirstLevelViewController;
-
 class PyxViewController : public MenuController {
   public:
     // store: handed on to the screens that follow; this list does not read it.
@@ -22,8 +20,6 @@ class PyxViewController : public MenuController {
     // from a cell). Only a first-level menu reached from a cell receives the cell's text as
     // its group; any other destination gets nothing.
     void prepareForSegue(TableController& destination, const Cell* sender) const;
-    // The tap on row: hands destination that row's group.
-    void prepareFirstLevel(FirstLevelViewController& destination, int row) const;
 
     // The first-level menu of the tapped group, titled by the group.
     [[nodiscard]] std::optional<Destination> open(const Cell& tapped) const override;

@@ -70,13 +70,6 @@ History::History(Limits limits, Clock clock)
         byProperty_[static_cast<std::size_t>(quantities[i].property)].push_back(i);
 }
 
-bool History::feeds(Chart chart, MetricValidator::DictionaryProperty property) {
-    const auto quantities = historyQuantities();
-    return std::any_of(quantities.begin(), quantities.end(), [&](const Quantity& q) {
-        return q.chart == chart && q.property == property;
-    });
-}
-
 double History::timeOf(std::optional<double> eventTimeMs) const {
     if (eventTimeMs && std::isfinite(*eventTimeMs) && *eventTimeMs > 0) return *eventTimeMs;
     return clock_();

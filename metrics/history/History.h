@@ -55,8 +55,6 @@ class History {
     // in the chart's newest two slots before the others, each group strongest first by the
     // ranking value they were last heard with; every quantity of the chart in the same order.
     [[nodiscard]] std::vector<const Series*> seriesOf(Chart chart, double fromMs) const;
-    // Whether any quantity of the chart is read from this kind.
-    [[nodiscard]] static bool feeds(Chart chart, MetricValidator::DictionaryProperty property);
 
     // The newest time seen in this session; nothing before the first point.
     [[nodiscard]] std::optional<double> newestMs() const { return newestMs_; }

@@ -272,7 +272,7 @@ TEST(History, TimeGoingBackwardsStartsANewSession) {
     EXPECT_EQ(history.seriesOf(Chart::GsmServing, 0)[0]->points().size(), 2U);
 }
 
-Dict lteTxPower(int pusch) {
+Dict txPower(int pusch) {
     Array info;
     info.emplace_back(entry({{"pusch_tx_power", Value(std::int64_t{pusch})}}));
     return Dict{{"tx_power_info", Value(std::move(info))}};
@@ -284,7 +284,7 @@ TEST(History, AChartsRevisionMovesOnlyWhenAPointOfThatChartIsAdded) {
     const auto gsm = history.revision(Chart::GsmServing);
     const auto lte = history.revision(Chart::LteServing);
     for (int second = 1; second <= 5; ++second)
-        history.record(P::myLTETxPowerDict, lteTxPower(10 + second), kStart + second * 1000.0);
+        history.record(P::myLTETxPowerDict, txPower(10 + second), kStart + second * 1000.0);
     EXPECT_EQ(history.revision(Chart::GsmServing), gsm);
     EXPECT_NE(history.revision(Chart::LteServing), lte);
 
@@ -325,10 +325,22 @@ TEST(History, OlderSeriesDropOutOfTheRequestedWindow) {
     EXPECT_TRUE(history.seriesOf(Chart::GsmServing, kStart + 1).empty());
 }
 
-TEST(History, FeedsTellsWhichKindsAChartReads) {
-    EXPECT_TRUE(History::feeds(Chart::LteServing, P::myLTETxPowerDict));
-    EXPECT_FALSE(History::feeds(Chart::LteServing, P::myUMTSTxPowerDict));
-    EXPECT_TRUE(History::feeds(Chart::GsmNeighbours, P::myGSMNbrMeasDict));
+TEST(History, AKindAddsPointsOnlyToTheChartsThatReadIt) {
+    History history;
+    history.record(P::myGSMIdleScellMeasDict, gsmIdle(-80), kStart);
+    const auto lte = history.revision(Chart::LteServing);
+    history.record(P::myUMTSTxPowerDict, txPower(12), kStart + 1000);
+    EXPECT_EQ(history.revision(Chart::LteServing), lte);
+    history.record(P::myLTETxPowerDict, txPower(12), kStart + 2000);
+    EXPECT_NE(history.revision(Chart::LteServing), lte);
+
+    const auto gsm = history.revision(Chart::GsmNeighbours);
+    Array list;
+    list.emplace_back(
+        entry({{"arfcn", Value(std::int64_t{58})}, {"rxlev", Value(std::int64_t{-82})}}));
+    history.record(P::myGSMNbrMeasDict, Dict{{"gsm_ncell_meas", Value(std::move(list))}},
+                   kStart + 3000);
+    EXPECT_NE(history.revision(Chart::GsmNeighbours), gsm);
 }
 
 TEST(History, GsmNeighboursAreKeyedByTheirArfcn) {

@@ -73,15 +73,21 @@ TEST_F(Menu, CategoriesAreListedInDisplayOrder) {
 }
 
 TEST_F(Menu, ChoosingUmtsThenTxPowerHandsTheSecondLevelThePair) {
-    FirstLevelViewController menu(*store);
-    launch.prepareFirstLevel(menu, 2);
-    EXPECT_EQ(menu.seguedThroughRow(), "UMTS");
+    const auto opened = launch.open(launch.cellForRowAtIndexPath(0, 2));
+    ASSERT_TRUE(opened);
+    const auto* const menu =
+        dynamic_cast<const FirstLevelViewController*>(opened->controller.get());
+    ASSERT_NE(menu, nullptr);
+    EXPECT_EQ(menu->seguedThroughRow(), "UMTS");
 
-    SecondLevelViewController screen(*store);
-    menu.prepareSecondLevel(screen, 6);
-    EXPECT_EQ(screen.firstSelection(), "UMTS");
-    EXPECT_EQ(screen.seguedThroughRow(), "Tx Power");
-    EXPECT_EQ(screen.categoryKey(), "UMTS Tx Power");
+    const auto chosen = menu->open(menu->cellForRowAtIndexPath(0, 6));
+    ASSERT_TRUE(chosen);
+    const auto* const screen =
+        dynamic_cast<const SecondLevelViewController*>(chosen->controller.get());
+    ASSERT_NE(screen, nullptr);
+    EXPECT_EQ(screen->firstSelection(), "UMTS");
+    EXPECT_EQ(screen->seguedThroughRow(), "Tx Power");
+    EXPECT_EQ(screen->categoryKey(), "UMTS Tx Power");
 }
 
 TEST_F(Menu, SegueToAnyOtherKindOfDestinationPassesNothing) {

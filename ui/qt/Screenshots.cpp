@@ -31,7 +31,7 @@ Screenshots::Screenshots(Navigator& navigator, QQuickWindow& window, const QDir&
       folder_(folder),
       paths_(paths()),
       chartDelayMs_(chartDelayMs),
-      charts_(chartNumbers()) {}
+      charts_(chartIndexes(paths_)) {}
 
 std::vector<QStringList> Screenshots::paths() {
     const PyxViewItems& items = sharedPyxViewItems();
@@ -44,12 +44,17 @@ std::vector<QStringList> Screenshots::paths() {
     return out;
 }
 
+std::vector<std::size_t> Screenshots::chartIndexes(const std::vector<QStringList>& paths) {
+    std::vector<std::size_t> out;
+    for (std::size_t i = 0; i < paths.size(); ++i)
+        if (paths[i].size() == 2 && chartForCategory(paths[i].join(' ').toStdString()))
+            out.push_back(i);
+    return out;
+}
+
 std::vector<int> Screenshots::chartNumbers() {
-    const auto all = paths();
     std::vector<int> out;
-    for (std::size_t i = 0; i < all.size(); ++i)
-        if (all[i].size() == 2 && chartForCategory(all[i].join(' ').toStdString()))
-            out.push_back(static_cast<int>(i) + 1);
+    for (const std::size_t i : chartIndexes(paths())) out.push_back(static_cast<int>(i) + 1);
     return out;
 }
 
@@ -90,7 +95,7 @@ void Screenshots::nextChart() {
         emit finished(0);
         return;
     }
-    const QStringList& path = paths_[static_cast<std::size_t>(charts_[chartsDone_] - 1)];
+    const QStringList& path = paths_[charts_[chartsDone_]];
     if (!navigator_.open(path) || !navigator_.openChart()) {
         systemLog("pyxon: cannot open the chart of " + path.join(" / ").toStdString());
         emit finished(1);
@@ -101,9 +106,8 @@ void Screenshots::nextChart() {
 
 void Screenshots::shoot() {
     if (inCharts_) {
-        const int number = charts_[chartsDone_];
-        if (!save(folder_.filePath(
-                fileName(number, paths_[static_cast<std::size_t>(number - 1)], true))))
+        const std::size_t index = charts_[chartsDone_];
+        if (!save(folder_.filePath(fileName(static_cast<int>(index) + 1, paths_[index], true))))
             return;
         ++chartsDone_;
         nextChart();

@@ -9,6 +9,7 @@
 #include <QString>
 #include <QStringList>
 
+#include <cstddef>
 #include <vector>
 
 #include "ui/qt/Navigator.h"
@@ -41,6 +42,10 @@ class Screenshots : public QObject {
     void finished(int status);
 
   private:
+    // The indexes into paths of the paths whose screen has a chart page.
+    [[nodiscard]] static std::vector<std::size_t> chartIndexes(
+        const std::vector<QStringList>& paths);
+
     void next();
     void nextChart();
     void shoot();
@@ -53,7 +58,7 @@ class Screenshots : public QObject {
     std::vector<QStringList> paths_;
     std::size_t done_ = 0;
     int chartDelayMs_;
-    std::vector<int> charts_;
+    std::vector<std::size_t> charts_;  // into paths_
     std::size_t chartsDone_ = 0;
     bool inCharts_ = false;
 };
