@@ -1,5 +1,6 @@
-// The store's side: a record taken by the intake, an event carried from the manager's serial
-// queue to the store, and a category screen answered in full.
+// The store's side: a record taken by the intake, the charts' history fed as in a long run, an
+// event carried from the manager's serial queue to the store, and a category screen answered in
+// full.
 #include <benchmark/benchmark.h>
 
 #include <atomic>
@@ -17,6 +18,7 @@
 #include "bench/Registration.h"
 #include "core/Log.h"
 #include "core/MainQueue.h"
+#include "metrics/MetricCatalogue.h"
 #include "metrics/MetricValidator.h"
 #include "metrics/history/History.h"
 #include "ui/PyxViewItems.h"
@@ -54,7 +56,8 @@ void account(benchmark::State& state, const Subject& subject) {
 // Record to stored dictionary: dispatch, decode, dictionary, timestamp text, conversions,
 // holders and the arrival line, on a store of its own; as "intake/history/..." the store also
 // feeds the charts' history, to compare with "intake/ours/...". (The corpus replays the same
-// times on every pass, so the history starts a new session at each pass, as for a replay.)
+// times on every pass, so the history starts a new session at each pass, as for a replay: its
+// series stay nearly empty. "history/ours/..." measures it full.)
 void registerIntake(const Subject& subject, bool withHistory) {
     const std::string side = withHistory ? "history" : "ours";
     benchmark::RegisterBenchmark(
@@ -72,6 +75,52 @@ void registerIntake(const Subject& subject, bool withHistory) {
                 }
             }
             account(state, subject);
+        });
+}
+
+// The history alone as it runs for hours: History::record on the stored dictionaries of the
+// subject's records (decoded once), one record a second of simulated time that keeps going
+// forward, after a warm-up longer than the history's window. Every ring is full, so each new
+// slot takes the place of the oldest, and neighbours that come and go recycle series.
+void registerHistory(const Subject& subject) {
+    struct Arrival {
+        MetricValidator::DictionaryProperty property;
+        Dict stored;
+    };
+    std::vector<Arrival> arrivals;
+    {
+        const SilencedSinks silenced;
+        const auto validator = MetricValidator::create(nullptr);
+        for (const CorpusRecord* r : subject.records) {
+            if (!validator->isMetricIDValidWithMetricdict(r->record)) continue;
+            const MetricKind* kind = findMetricKind(r->metricID);
+            if (kind == nullptr || !kind->property) continue;
+            if (const auto& stored = validator->dictionary(*kind->property))
+                arrivals.push_back(Arrival{*kind->property, *stored});
+        }
+    }
+    if (arrivals.empty()) return;
+    benchmark::RegisterBenchmark(
+        ("history/ours/" + subject.name).c_str(), [arrivals](benchmark::State& state) {
+            constexpr double kStepMs = 1000;
+            History history;
+            double timeMs = 1'717'200'000'000.0;  // 2024-06-01 00:00:00 UTC
+            const double warmedUpMs = timeMs + history.limits().windowMs + 10 * 60'000.0;
+            while (timeMs < warmedUpMs) {
+                for (const Arrival& a : arrivals) {
+                    history.record(a.property, a.stored, timeMs);
+                    timeMs += kStepMs;
+                }
+            }
+            for (auto _ : state) {
+                for (const Arrival& a : arrivals) {
+                    history.record(a.property, a.stored, timeMs);
+                    timeMs += kStepMs;
+                }
+            }
+            state.SetItemsProcessed(state.iterations() *
+                                    static_cast<std::int64_t>(arrivals.size()));
+            state.counters["series"] = static_cast<double>(history.seriesCount());
         });
 }
 
@@ -207,8 +256,10 @@ void registerIntakeBenchmarks(const std::vector<CorpusRecord>& corpus) {
     const std::vector<Subject> subjects = subjectsOf(corpus);
     for (const Subject& subject : subjects) registerIntake(subject, false);
     // With the history: the realistic mix and the whole corpus (the last two subjects).
-    for (std::size_t i = subjects.size() >= 2 ? subjects.size() - 2 : 0; i < subjects.size(); ++i)
+    for (std::size_t i = subjects.size() >= 2 ? subjects.size() - 2 : 0; i < subjects.size(); ++i) {
         registerIntake(subjects[i], true);
+        registerHistory(subjects[i]);
+    }
     registerPath(subjects.back());  // the whole corpus
     registerScreen(corpus);
 }

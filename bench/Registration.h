@@ -1,8 +1,8 @@
 // The benchmarks that run over the corpus are registered at start-up, once the corpus is
 // loaded: one per metric kind, one per large record, and the whole corpus.
 //
-// Names are "<measure>/<side>/<subject>": measure typed, dict, intake, path or screen; side
-// ours, pb_fresh, pb_reused or pb_json; subject a message class, "large: ..." or "corpus".
+// Names are "<measure>/<side>/<subject>": measure typed, dict, intake, history, path or screen;
+// side ours, pb_fresh, pb_reused or pb_json; subject a message class, "large: ..." or "corpus".
 // bench/run turns them into its table.
 #pragma once
 

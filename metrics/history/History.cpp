@@ -57,7 +57,7 @@ History::History() : History(Limits{}) {}
 History::History(Limits limits, Clock clock)
     : limits_(limits),
       clock_(clock ? std::move(clock) : Clock(systemClockMs)),
-      perQuantity_(historyQuantities().size(), 0),
+      ofQuantity_(historyQuantities().size()),
       single_(historyQuantities().size(), nullptr),
       byProperty_(MetricValidator::kDictionaryPropertyCount) {
     if (limits_.pointsPerSeries == 0 || !(limits_.windowMs > 0) || limits_.seriesPerQuantity == 0)
@@ -183,23 +183,23 @@ Series& History::singleFor(std::size_t quantity) {
 
 Series& History::seriesFor(SeriesKey key) {
     if (const auto found = index_.find(key); found != index_.end()) return *found->second;
-    if (perQuantity_[key.quantity] < limits_.seriesPerQuantity) {
+    std::vector<Series*>& ofQuantity = ofQuantity_[key.quantity];
+    if (ofQuantity.size() < limits_.seriesPerQuantity) {
         const double slotMs = limits_.windowMs / static_cast<double>(limits_.pointsPerSeries);
         series_.push_back(std::make_unique<Series>(key, limits_.pointsPerSeries, slotMs));
-        ++perQuantity_[key.quantity];
+        ofQuantity.push_back(series_.back().get());
         index_.emplace(key, series_.back().get());
         return *series_.back();
     }
     // Full: the series of this quantity fed longest ago gives way.
     Series* stalest = nullptr;
     double stalestMs = std::numeric_limits<double>::infinity();
-    for (const auto& series : series_) {
-        if (series->key().quantity != key.quantity) continue;
+    for (Series* series : ofQuantity) {
         const double newest = series->points().empty() ? -std::numeric_limits<double>::infinity()
                                                        : series->points().newest().timeMs;
         if (newest < stalestMs) {
             stalestMs = newest;
-            stalest = series.get();
+            stalest = series;
         }
     }
     // The index keeps its node: re-keyed in place, nothing is allocated.

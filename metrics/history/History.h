@@ -71,7 +71,10 @@ class History {
   private:
     struct KeyHash {
         std::size_t operator()(const SeriesKey& k) const noexcept {
-            return std::hash<std::int64_t>()(k.a * 1000003 + k.b) ^ (k.quantity * 0x9E3779B9U);
+            // Unsigned, so that large cell numbers wrap instead of overflowing.
+            const auto a = static_cast<std::uint64_t>(k.a);
+            const auto b = static_cast<std::uint64_t>(k.b);
+            return std::hash<std::uint64_t>()((a * 1000003U + b) ^ (k.quantity * 0x9E3779B9U));
         }
     };
 
@@ -89,7 +92,7 @@ class History {
     Clock clock_;
     std::vector<std::unique_ptr<Series>> series_;
     std::unordered_map<SeriesKey, Series*, KeyHash> index_;
-    std::vector<std::size_t> perQuantity_;  // series made for each quantity
+    std::vector<std::vector<Series*>> ofQuantity_;  // the series made for each quantity
     std::vector<Series*> single_;  // the one series of a quantity without entries, once made
     // The quantities read from each kind, by property.
     std::vector<std::vector<std::size_t>> byProperty_;

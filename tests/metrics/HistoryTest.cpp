@@ -2,6 +2,8 @@
 // the neighbour ranking and replays whose times go backwards.
 #include <gtest/gtest.h>
 
+#include <cstdint>
+#include <limits>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -352,6 +354,21 @@ TEST(History, GsmNeighboursAreKeyedByTheirArfcn) {
     const auto series = history.seriesOf(Chart::GsmNeighbours, 0);
     ASSERT_EQ(series.size(), 1U);
     EXPECT_EQ(series[0]->label(), "ARFCN 58");
+}
+
+TEST(History, EntriesWithTheLargestNumbersAreKeyedLikeAnyOther) {
+    History history;
+    Array list;
+    for (const std::int64_t earfcn :
+         {std::numeric_limits<std::int64_t>::max(), std::numeric_limits<std::int64_t>::max() - 1})
+        list.emplace_back(
+            entry({{"nbr_earfcn", Value(earfcn)},
+                   {"nbr_phys_cell_id", Value(std::numeric_limits<std::int64_t>::max())},
+                   {"nbr_rsrp", Value(std::int64_t{-90})},
+                   {"nbr_rsrq", Value(-10.5F)}}));
+    history.record(P::myLTEIntraRatMeasDict, Dict{{"meas_nbr_eutra", Value(std::move(list))}},
+                   kStart);
+    EXPECT_EQ(history.seriesOf(Chart::LteNeighbours, 0).size(), 4U);  // RSRP and RSRQ of two
 }
 
 TEST(History, RefusesLimitsThatHoldNothing) {
