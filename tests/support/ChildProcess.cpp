@@ -87,6 +87,9 @@ ChildProcess::ChildProcess(Options options) {
 
 ChildProcess::~ChildProcess() {
     terminate(std::chrono::seconds(5));
+    // What the child started (the programs of a shell pipeline) is in its process group: none
+    // of it outlives the test.
+    if (pid_ > 0) ::kill(-pid_, SIGKILL);
     if (stdout_ >= 0) ::close(stdout_);
     if (stderr_ >= 0) ::close(stderr_);
 }
@@ -144,7 +147,7 @@ int ChildProcess::terminate(std::chrono::milliseconds timeout) {
     const auto until = std::chrono::steady_clock::now() + timeout;
     while (running()) {
         if (std::chrono::steady_clock::now() > until) {
-            ::kill(pid_, SIGKILL);
+            ::kill(-pid_, SIGKILL);
             int status = 0;
             ::waitpid(pid_, &status, 0);
             status_ = statusCode(status);

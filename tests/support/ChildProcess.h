@@ -1,5 +1,6 @@
 // A program the tests start and always end: it is sent SIGTERM (then SIGKILL) when the object
-// goes, and dies with the test process if that one is killed first. It reads /dev/null.
+// goes, and dies with the test process if that one is killed first. It reads /dev/null. It
+// leads a process group of its own, and what it started is killed with it.
 #pragma once
 
 #include <sys/types.h>
