@@ -224,8 +224,7 @@ FocusScope {
                         panel.names = names
                         panel.shown = signature
                     }
-                    timeAxis.min = new Date(page.chart.fromMs)
-                    timeAxis.max = new Date(page.chart.toMs)
+                    moveWindow()
                     valueAxis.min = page.chart.minimum(panel.index)
                     valueAxis.max = page.chart.maximum(panel.index)
                     valueAxis.applyNiceNumbers()
@@ -233,10 +232,16 @@ FocusScope {
                         page.chart.fill(panel.index, k, view.series(k))
                 }
 
+                function moveWindow() {
+                    timeAxis.min = new Date(page.chart.fromMs)
+                    timeAxis.max = new Date(page.chart.toMs)
+                }
+
                 Component.onCompleted: redraw()
                 Connections {
                     target: page.chart
                     function onChanged() { panel.redraw() }
+                    function onWindowMoved() { panel.moveWindow() }
                 }
             }
         }

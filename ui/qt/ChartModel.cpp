@@ -32,6 +32,7 @@ void ChartModel::setWindowMinutes(int minutes) {
     emit windowMinutesChanged();
     rebuild();
     emit changed();
+    emit windowMoved();
 }
 
 QString ChartModel::emptyText() const {
@@ -98,9 +99,19 @@ void ChartModel::fill(int panel, int index, QObject* series) const {
 }
 
 void ChartModel::refresh() {
-    if (history_->revision(chart_) == readRevision_) return;
-    rebuild();
-    emit changed();
+    const double newestMs = history_->newestMs().value_or(0);
+    const double windowMs = windowMinutes_ * 60'000.0;
+    const bool moved = newestMs != toMs_;
+    if (history_->revision(chart_) != readRevision_ ||
+        (moved && !panels_.empty() && newestMs - windowMs > leavesAfterMs_)) {
+        rebuild();
+        emit changed();
+        emit windowMoved();
+    } else if (moved) {
+        toMs_ = newestMs;
+        fromMs_ = toMs_ - windowMs;
+        emit windowMoved();
+    }
 }
 
 void ChartModel::rebuild() {
@@ -110,6 +121,9 @@ void ChartModel::rebuild() {
     fromMs_ = toMs_ - windowMinutes_ * 60'000.0;
 
     const auto series = history_->seriesOf(chart_, fromMs_);
+    leavesAfterMs_ = std::numeric_limits<double>::infinity();
+    for (const Series* s : series)
+        leavesAfterMs_ = std::min(leavesAfterMs_, s->points().newest().timeMs);
     // Panels in the order their units first occur among the chart's quantities.
     const auto quantities = historyQuantities();
     std::vector<bool> present(quantities.size(), false);

@@ -1,7 +1,9 @@
 // A chart page's contents for Qt Quick: the history of one chart over the chosen window, as
 // one panel per unit (dBm, dB) holding the lines of that unit, all over one time axis. The
 // page asks it to refresh (at most once a second while it is shown); a refresh reads the
-// history only when points were added to this chart (or the history started over).
+// history only when points were added to this chart (or the history started over), or when a
+// line it draws leaves the window. When only the time moved on (other kinds arrived), the
+// window follows it: the time axis scrolls and nothing else is read.
 #pragma once
 
 #include <QList>
@@ -32,8 +34,8 @@ class ChartModel : public QObject {
     Q_PROPERTY(QString emptyText READ emptyText NOTIFY changed)
     Q_PROPERTY(QString missingText READ missingText NOTIFY changed)
     Q_PROPERTY(int panelCount READ panelCount NOTIFY changed)
-    Q_PROPERTY(double fromMs READ fromMs NOTIFY changed)
-    Q_PROPERTY(double toMs READ toMs NOTIFY changed)
+    Q_PROPERTY(double fromMs READ fromMs NOTIFY windowMoved)
+    Q_PROPERTY(double toMs READ toMs NOTIFY windowMoved)
 
   public:
     ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent = nullptr);
@@ -72,12 +74,16 @@ class ChartModel : public QObject {
     // Puts those points into a line series of the chart view (replacing its points).
     Q_INVOKABLE void fill(int panel, int segment, QObject* series) const;
 
-    // Reads the history again if points were added to the chart since it was last read;
-    // emits changed when it did.
+    // Reads the history again if points were added to the chart since it was last read, or a
+    // line would leave the window, and emits changed (and windowMoved); when only the newest
+    // time moved on, moves the window to it and emits windowMoved alone.
     Q_INVOKABLE void refresh();
 
   signals:
+    // The lines, panels and texts changed (the window too).
     void changed();
+    // The window's times changed.
+    void windowMoved();
     void windowMinutesChanged();
 
   private:
@@ -101,6 +107,9 @@ class ChartModel : public QObject {
     double fromMs_ = 0;
     double toMs_ = 0;
     std::uint64_t readRevision_ = 0;  // the chart's revision of the history last read
+    // The oldest of the drawn lines' newest points: once the window starts after it, that
+    // line leaves the chart.
+    double leavesAfterMs_ = 0;
 };
 
 }  // namespace pyx::qt

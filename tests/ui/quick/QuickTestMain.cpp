@@ -28,7 +28,8 @@ class TestStore : public QObject {
     explicit TestStore(std::shared_ptr<pyx::MetricValidator> store) : store_(std::move(store)) {}
 
     // property: a dictionary property's name ("myLTECDRXConfigDict"); fields in the given
-    // key order: ["key", value, "key", value, ...].
+    // key order: ["key", value, "key", value, ...], where a value that is a list holds entries
+    // given the same way.
     Q_INVOKABLE bool setDictionary(const QString& property, const QVariantList& fields) {
         const auto p = pyx::MetricValidator::dictionaryPropertyNamed(property.toStdString());
         if (!p || fields.size() % 2 != 0) return false;
@@ -55,10 +56,17 @@ class TestStore : public QObject {
         for (qsizetype i = 0; i + 1 < fields.size(); i += 2) {
             const QVariant& value = fields.at(i + 1);
             const std::string key = fields.at(i).toString().toStdString();
-            if (value.typeId() == QMetaType::QString)
+            if (value.typeId() == QMetaType::QString) {
                 dict.set(key, pyx::Value(value.toString().toStdString()));
-            else
+            } else if (value.typeId() == QMetaType::QVariantList) {
+                // A list of entries, each given as its own [key, value, ...] list.
+                pyx::Array entries;
+                for (const QVariant& entry : value.toList())
+                    entries.emplace_back(dictionaryOf(entry.toList()));
+                dict.set(key, pyx::Value(std::move(entries)));
+            } else {
                 dict.set(key, pyx::Value(static_cast<std::int64_t>(value.toLongLong())));
+            }
         }
         return dict;
     }

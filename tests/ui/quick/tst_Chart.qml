@@ -3,7 +3,8 @@ import QtTest
 
 // The chart pages as a user meets them: the button that opens them, the words shown before
 // anything has arrived, one panel per unit over one time window, the window selector, and a
-// refresh that reads the history only when it has changed.
+// refresh that reads the history only when it has changed, and a time axis that follows the
+// newest time.
 TestCase {
     id: testCase
     name: "Chart"
@@ -19,6 +20,11 @@ TestCase {
     SignalSpy {
         id: changedSpy
         signalName: "changed"
+    }
+
+    SignalSpy {
+        id: movedSpy
+        signalName: "windowMoved"
     }
 
     function init() {
@@ -130,6 +136,34 @@ TestCase {
         page.chart.refresh()
         compare(changedSpy.count, 1)
         compare(page.chart.toMs, start + 2000)
+    }
+
+    function lteTxPower(dBm, atMs) {
+        verify(testStore.record("myLTETxPowerDict",
+                                ["tx_power_info", [["pusch_tx_power", dBm]]], atMs))
+    }
+
+    function test_theTimeAxisFollowsOtherKindsWithoutRereadingTheLines() {
+        idle(-82, start)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        changedSpy.target = page.chart
+        movedSpy.target = page.chart
+        changedSpy.clear()
+        movedSpy.clear()
+        lteTxPower(20, start + 60000)
+        page.chart.refresh()
+        compare(changedSpy.count, 0)
+        compare(movedSpy.count, 1)
+        compare(page.chart.toMs, start + 60000)
+        compare(page.chart.fromMs, start + 60000 - 5 * 60000)
+        verify(!page.chart.empty)
+
+        // Once the GSM line is older than the window, the page says so.
+        lteTxPower(21, start + 6 * 60000)
+        page.chart.refresh()
+        compare(changedSpy.count, 1)
+        verify(page.chart.empty)
+        verify(page.chart.emptyText.indexOf("RxLev idle") >= 0, page.chart.emptyText)
     }
 
     function test_updatesWhileShownAndStopsWhenClosed() {
