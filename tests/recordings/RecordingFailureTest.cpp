@@ -101,7 +101,15 @@ TEST(RecordingFailure, AFileSizeLimitStopsTheRecordingWithOneLineAndTheFileStill
             if (std::chrono::steady_clock::now() > deadline) _exit(3);
             writer.add(velk::kEventMetric, sampleEvent(n, 200));
             ++added;
-            if (n % 10 == 9) std::this_thread::sleep_for(std::chrono::milliseconds(1));
+            if (n % 50 != 49) continue;
+            // Each batch is committed before the next is added: a writer thread held back by a
+            // loaded machine would otherwise take the whole limit in its first transaction,
+            // which then fails with nothing committed.
+            for (auto c = writer.counts(); !c.stopped && c.recorded + c.dropped < added;
+                 c = writer.counts()) {
+                if (std::chrono::steady_clock::now() > deadline) _exit(3);
+                std::this_thread::sleep_for(std::chrono::milliseconds(1));
+            }
         }
         // The recording has stopped; the program goes on and closes normally.
         writer.add(velk::kEventMetric, sampleEvent(0));
