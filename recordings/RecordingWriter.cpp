@@ -198,16 +198,8 @@ struct RecordingWriter::State {
         insert.bind(1, wallNow());
         insert.bind(2, std::string_view(s.programVersion));
         insert.bind(3, std::string_view(s.source));
-        if (s.seed) {
-            insert.bind(4, *s.seed);
-        } else {
-            insert.bindNull(4);
-        }
-        if (s.speed) {
-            insert.bind(5, *s.speed);
-        } else {
-            insert.bindNull(5);
-        }
+        insert.bindOrNull(4, s.seed);
+        insert.bindOrNull(5, s.speed);
         insert.bind(6, std::string_view(s.host));
         insert.step();
         sessionID = sqlite3_last_insert_rowid(db.handle());
@@ -268,11 +260,7 @@ struct RecordingWriter::State {
                     insert.bind(2, std::string_view(event.stream));
                     insert.bind(3, event.wallNs);
                     insert.bind(4, event.monoNs);
-                    if (encoded.metricID) {
-                        insert.bind(5, *encoded.metricID);
-                    } else {
-                        insert.bindNull(5);
-                    }
+                    insert.bindOrNull(5, encoded.metricID);
                     if (encoded.payload) {
                         insert.bindBlob(6, *encoded.payload);
                     } else {

@@ -26,6 +26,15 @@ class SqliteStatement {
     void bind(int index, double value);
     void bind(int index, std::string_view text);
     void bindBlob(int index, std::span<const std::uint8_t> bytes);
+    // The value, or NULL when there is none.
+    template <typename T>
+    void bindOrNull(int index, const std::optional<T>& value) {
+        if (value) {
+            bind(index, *value);
+        } else {
+            bindNull(index);
+        }
+    }
 
     // Runs to the next row: true when there is one, false when done. Throws SqliteError.
     bool step();

@@ -113,17 +113,19 @@ void damagedLine(std::ostream& err, const RecordingError& e, std::uint64_t expor
         << " events read before it\n";
 }
 
-int exportJsonl(const RecordingReader& reader, const RecordingReader::Filter& filter,
-                std::ostream& out, std::ostream& err) {
-    std::string buffer;
+// Every event of the filter, as append writes it after what buffer already holds, to out in
+// chunks; exported counts the events read. A damaged recording ends it with one line on err:
+// 1, else 0 (whether out took everything is the caller's to see).
+template <typename Append>
+int writeEvents(const RecordingReader& reader, const RecordingReader::Filter& filter,
+                std::string buffer, std::ostream& out, std::ostream& err, std::uint64_t& exported,
+                const Append& append) {
     buffer.reserve(kChunk + 4096);
-    std::uint64_t exported = 0;
     int status = 0;
     try {
         reader.forEach(filter, [&](RecordedEvent& event) {
-            appendExportLine(buffer, event);
-            buffer += '\n';
             ++exported;
+            append(buffer, event);
             if (buffer.size() >= kChunk) {
                 out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
                 buffer.clear();
@@ -137,6 +139,16 @@ int exportJsonl(const RecordingReader& reader, const RecordingReader::Filter& fi
     out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
     out.flush();
     return status;
+}
+
+int exportJsonl(const RecordingReader& reader, const RecordingReader::Filter& filter,
+                std::ostream& out, std::ostream& err) {
+    std::uint64_t exported = 0;
+    return writeEvents(reader, filter, {}, out, err, exported,
+                       [](std::string& buffer, RecordedEvent& event) {
+                           appendExportLine(buffer, event);
+                           buffer += '\n';
+                       });
 }
 
 int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filter,
@@ -165,25 +177,24 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
     }
 
     // Second pass: the rows.
-    std::string buffer;
-    appendCsvRow(buffer, columns);
+    std::string header;
+    appendCsvRow(header, columns);
     std::vector<std::string> cells(columns.size());
     std::uint64_t exported = 0;
     std::uint64_t refused = 0;
-    int status = 0;
     const auto store = MetricValidator::create(nullptr);
-    try {
-        reader.forEach(filter, [&](RecordedEvent& event) {
-            ++exported;
+    const int status = writeEvents(
+        reader, filter, std::move(header), out, err, exported,
+        [&](std::string& buffer, RecordedEvent& event) {
             const DecodeOutcome outcome = decodeRecord(*store, recordOf(event));
             if (outcome.error) {
                 ++refused;
                 err << "pyxonctl export: event " << event.id
                     << " skipped: " << metricIDText(outcome.metricID) << ": " << *outcome.error
                     << '\n';
-                return true;
+                return;
             }
-            if (outcome.dictionary == nullptr) return true;
+            if (outcome.dictionary == nullptr) return;
             for (auto& cell : cells) cell.clear();
             cells[0] = isoTime(event.wallNs);
             cells[1] = metricIDText(outcome.metricID);
@@ -194,18 +205,7 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
                 if (at != columnIndex.end()) cells[at->second] = cellText(v);
             });
             appendCsvRow(buffer, cells);
-            if (buffer.size() >= kChunk) {
-                out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
-                buffer.clear();
-            }
-            return out.good();
         });
-    } catch (const RecordingError& e) {
-        damagedLine(err, e, exported);
-        status = 1;
-    }
-    out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
-    out.flush();
     if (refused > 0)
         err << "pyxonctl export: " << refused << " of " << exported
             << " records were refused by the store and skipped\n";
