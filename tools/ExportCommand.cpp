@@ -113,14 +113,20 @@ void damagedLine(std::ostream& err, const RecordingError& e, std::uint64_t expor
         << " events read before it\n";
 }
 
+struct Written {
+    int status = 0;            // 1 when the recording was damaged, else 0
+    std::uint64_t events = 0;  // read from the recording
+};
+
 // Every event of the filter, as append writes it after what buffer already holds, to out in
-// chunks; exported counts the events read. A damaged recording ends it with one line on err:
-// 1, else 0 (whether out took everything is the caller's to see).
+// chunks. A damaged recording ends it with one line on err. Whether out took everything is the
+// caller's to see.
 template <typename Append>
-int writeEvents(const RecordingReader& reader, const RecordingReader::Filter& filter,
-                std::string buffer, std::ostream& out, std::ostream& err, std::uint64_t& exported,
-                const Append& append) {
+Written writeEvents(const RecordingReader& reader, const RecordingReader::Filter& filter,
+                    std::string buffer, std::ostream& out, std::ostream& err,
+                    const Append& append) {
     buffer.reserve(kChunk + 4096);
+    std::uint64_t exported = 0;
     int status = 0;
     try {
         reader.forEach(filter, [&](RecordedEvent& event) {
@@ -138,17 +144,17 @@ int writeEvents(const RecordingReader& reader, const RecordingReader::Filter& fi
     }
     out.write(buffer.data(), static_cast<std::streamsize>(buffer.size()));
     out.flush();
-    return status;
+    return Written{status, exported};
 }
 
 int exportJsonl(const RecordingReader& reader, const RecordingReader::Filter& filter,
                 std::ostream& out, std::ostream& err) {
-    std::uint64_t exported = 0;
-    return writeEvents(reader, filter, {}, out, err, exported,
+    return writeEvents(reader, filter, {}, out, err,
                        [](std::string& buffer, RecordedEvent& event) {
                            appendExportLine(buffer, event);
                            buffer += '\n';
-                       });
+                       })
+        .status;
 }
 
 int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filter,
@@ -180,11 +186,10 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
     std::string header;
     appendCsvRow(header, columns);
     std::vector<std::string> cells(columns.size());
-    std::uint64_t exported = 0;
     std::uint64_t refused = 0;
     const auto store = MetricValidator::create(nullptr);
-    const int status = writeEvents(
-        reader, filter, std::move(header), out, err, exported,
+    const Written written = writeEvents(
+        reader, filter, std::move(header), out, err,
         [&](std::string& buffer, RecordedEvent& event) {
             const DecodeOutcome outcome = decodeRecord(*store, recordOf(event));
             if (outcome.error) {
@@ -207,9 +212,9 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
             appendCsvRow(buffer, cells);
         });
     if (refused > 0)
-        err << "pyxonctl export: " << refused << " of " << exported
+        err << "pyxonctl export: " << refused << " of " << written.events
             << " records were refused by the store and skipped\n";
-    return status;
+    return written.status;
 }
 
 }  // namespace
