@@ -1,0 +1,8 @@
+#include "sources/diag/DecodeState.h"
+#include "sources/diag/LogDecoder.h"
+
+namespace pyx::diag {
+
+std::span<const LogDecoderRow> nasDecoders() { return {}; }
+
+}  // namespace pyx::diag
