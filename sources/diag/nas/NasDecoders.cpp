@@ -1,7 +1,6 @@
 // NAS log packets: the EMM state (0xB0EE), the EPS bearers (0xB0E5), and the GMM and MM
 // states (0x7130, 0x7131). Their layouts are those the MobileInsight decoder reads; the
 // values were checked by hand against the NAS messages of the captures.
-#include <algorithm>
 #include <memory>
 
 #include "messages/Messages.h"
@@ -20,17 +19,21 @@ namespace id = local::id;
 constexpr std::uint8_t kFirstEpsBearerId = 5;
 constexpr std::uint8_t kLastEpsBearerId = 15;
 
-// The active bearers as our bearer list shows them. An EPS bearer's identity is also its
-// NSAPI (3GPP TS 23.401), the one field of ours it fills; QCI and bit rates have none.
+// The active bearers as our bearer list shows them, in identity order. An EPS bearer's
+// identity is also its NSAPI (3GPP TS 23.401), the one field of ours it fills; QCI and bit
+// rates have none.
 MetricOut activeBearers(const NasState& nas, std::uint64_t timeMs) {
     KCellularActivatedBearerContexts m;
     m.setTimestamp(timeMs);
-    m.setBearerContextCount(static_cast<std::uint32_t>(nas.bearers.size()));
-    for (const EpsBearer& bearer : nas.bearers) {
+    std::uint32_t count = 0;
+    for (std::uint8_t bearerId = kFirstEpsBearerId; bearerId <= kLastEpsBearerId; ++bearerId) {
+        if ((nas.activeBearers >> bearerId & 1U) == 0) continue;
         auto context = std::make_shared<BearerContext>();
-        context->setNsapi(bearer.id);
+        context->setNsapi(bearerId);
         m.addBearerContext(std::move(context));
+        ++count;
     }
+    m.setBearerContextCount(count);
     return {id::K_CELLULAR_ACTIVE_BEARER, m.data()};
 }
 
@@ -60,44 +63,35 @@ bool emmState(const LogPacket& packet, DecodeState& state, std::vector<MetricOut
     out.push_back({id::K_LTE_EMM_CTXT, m.data()});
 
     constexpr std::uint8_t kNull = 0, kDeregistered = 1;
-    if ((emm == kNull || emm == kDeregistered) && !state.nas.bearers.empty()) {
-        state.nas.bearers.clear();
+    if ((emm == kNull || emm == kDeregistered) && state.nas.activeBearers != 0) {
+        state.nas.activeBearers = 0;
         out.push_back(activeBearers(state.nas, packet.timeMs));
     }
     return true;
 }
 
 // ESM bearer state version 1: u8 version, u8 bearer type (0 default, 1 dedicated), u8 EPS
-// bearer identity, u8 state, 6 bytes (the first the modem's context slot), u8 QoS length,
-// u8 QCI, u8 UL/DL MBR, u8 UL/DL GBR, and their four extensions: 20 bytes.
-// The states as the captures show them: 1 on an activation request, 2 once active (again
-// after each service request), 3 on a modification request, 0 when deactivated. A
-// deactivation record carries identity 0 and the slot of the bearer it ends (sprint: the
-// deactivation of bearer 5 is logged as identity 0 in bearer 5's slot 0); slot 0xFF names
-// none.
+// bearer identity, u8 state, 6 bytes, u8 QoS length, u8 QCI, u8 UL/DL MBR, u8 UL/DL GBR, and
+// their four extensions: 20 bytes. The states as the captures show them against the ESM
+// messages around them: 1 on an activation request, 2 once active (again after each service
+// request), 3 on a modification request, 0 when deactivated. A deactivation record may carry
+// identity 0 (sprint, after the deactivation of bearer 5): it names no bearer, so none
+// leaves; the list still empties when EMM deregisters.
 bool esmBearerState(const LogPacket& packet, DecodeState& state, std::vector<MetricOut>& out) {
     const Reader r(packet.payload);
     if (r.size() < 20) return false;
     const std::uint8_t bearerId = r.u8(2);
     const std::uint8_t bearerState = r.u8(3);
-    const std::uint8_t slot = r.u8(4);
-    const bool validId = bearerId >= kFirstEpsBearerId && bearerId <= kLastEpsBearerId;
-    auto& bearers = state.nas.bearers;
+    const bool named = bearerId >= kFirstEpsBearerId && bearerId <= kLastEpsBearerId;
+    const auto bit = static_cast<std::uint16_t>(named ? 1U << bearerId : 0U);
 
     constexpr std::uint8_t kInactive = 0, kModifyPending = 3;
     if (bearerState == kInactive) {
-        std::erase_if(bearers, [&](const EpsBearer& b) {
-            return validId ? b.id == bearerId : bearerId == 0 && b.slot == slot;
-        });
+        if (!named && bearerId != 0) return false;
+        state.nas.activeBearers = static_cast<std::uint16_t>(state.nas.activeBearers & ~bit);
     } else if (bearerState <= kModifyPending) {
-        if (!validId) return false;
-        const auto at =
-            std::lower_bound(bearers.begin(), bearers.end(), bearerId,
-                             [](const EpsBearer& b, std::uint8_t wanted) { return b.id < wanted; });
-        if (at != bearers.end() && at->id == bearerId)
-            at->slot = slot;
-        else
-            bearers.insert(at, EpsBearer{bearerId, slot});
+        if (!named) return false;
+        state.nas.activeBearers = static_cast<std::uint16_t>(state.nas.activeBearers | bit);
     } else {
         return false;  // a state the captures do not show
     }

@@ -2,20 +2,12 @@
 #pragma once
 
 #include <cstdint>
-#include <vector>
 
 namespace pyx::diag {
 
-// One EPS bearer context the modem holds active, with the index of the modem's context slot
-// that its bearer-state records carry (byte 4).
-struct EpsBearer {
-    std::uint8_t id = 0;  // EPS bearer identity, 5 to 15
-    std::uint8_t slot = 0;
-};
-
-// The active EPS bearers in identity order: at most one per identity, so at most 11.
 struct NasState {
-    std::vector<EpsBearer> bearers;
+    // The EPS bearers the modem holds active: bit n set for EPS bearer identity n (5 to 15).
+    std::uint16_t activeBearers = 0;
 };
 
 }  // namespace pyx::diag

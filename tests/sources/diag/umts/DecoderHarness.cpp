@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <fstream>
 #include <iterator>
 #include <variant>
@@ -102,9 +103,17 @@ std::uint16_t crc16(std::span<const std::uint8_t> bytes) {
 }  // namespace
 
 std::vector<Bytes> capturePayloads(const std::string& file, std::uint16_t code) {
+    std::vector<Bytes> payloads;
+    for (CapturedPacket& packet : capturePackets(file, std::span(&code, 1)))
+        payloads.push_back(std::move(packet.payload));
+    return payloads;
+}
+
+std::vector<CapturedPacket> capturePackets(const std::string& file,
+                                           std::span<const std::uint16_t> codes) {
     std::ifstream in(sharedDiag() / "captures" / file, std::ios::binary);
     const Bytes raw{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
-    std::vector<Bytes> payloads;
+    std::vector<CapturedPacket> packets;
     Bytes frame;
     for (std::size_t i = 0; i < raw.size(); ++i) {
         if (raw[i] != 0x7E) {
@@ -119,12 +128,15 @@ std::vector<Bytes> capturePayloads(const std::string& file, std::uint16_t code) 
                                     (body[body.size() - 2] | body[body.size() - 1] << 8)) {
             body = body.first(body.size() - 2);
             if (body[0] == 0x98 && body.size() > 8) body = body.subspan(8);
-            if (body[0] == 0x10 && body.size() >= 16 && (body[6] | body[7] << 8) == code)
-                payloads.emplace_back(body.begin() + 16, body.end());
+            const auto code =
+                static_cast<std::uint16_t>(body.size() >= 16 ? body[6] | body[7] << 8 : 0);
+            if (body[0] == 0x10 && body.size() >= 16 &&
+                std::find(codes.begin(), codes.end(), code) != codes.end())
+                packets.push_back({code, Bytes(body.begin() + 16, body.end())});
         }
         frame.clear();
     }
-    return payloads;
+    return packets;
 }
 
 }  // namespace pyx::diag::test

@@ -47,4 +47,12 @@ void feed(const std::shared_ptr<MetricValidator>& store, const std::vector<Metri
 // of ../shared/diag/captures, in stream order; frames with a bad CRC are skipped.
 [[nodiscard]] std::vector<Bytes> capturePayloads(const std::string& file, std::uint16_t code);
 
+// The log packets of any of codes in a capture, in stream order.
+struct CapturedPacket {
+    std::uint16_t code = 0;
+    Bytes payload;
+};
+[[nodiscard]] std::vector<CapturedPacket> capturePackets(const std::string& file,
+                                                         std::span<const std::uint16_t> codes);
+
 }  // namespace pyx::diag::test
