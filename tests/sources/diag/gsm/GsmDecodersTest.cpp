@@ -248,5 +248,9 @@ TEST(GsmScreens, ServingCellAndNeighboursShowTheVectorsValues) {
     EXPECT_EQ(shown("GSM Neighbor Cell Meas", "rxlev", 5), "-110");  // -114.25 dBm: RXLEV 0
 }
 
+TEST(GsmDecoders, NoisePayloadsNeverReadPastTheirEndAndWhatIsWrittenDecodes) {
+    EXPECT_GT(feedNoise(gsmDecoders()), 0U);
+}
+
 }  // namespace
 }  // namespace pyx::diag::test

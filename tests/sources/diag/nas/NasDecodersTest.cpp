@@ -297,5 +297,9 @@ TEST(NasScreens, LteNasActiveBearersAndUmtsNasShowTheCapturesValues) {
     EXPECT_EQ(shown("UMTS", "NAS MM", "update_status"), "STATUS_UPDATED");
 }
 
+TEST(NasDecoders, NoisePayloadsNeverReadPastTheirEndAndWhatIsWrittenDecodes) {
+    EXPECT_GT(feedNoise(nasDecoders()), 0U);
+}
+
 }  // namespace
 }  // namespace pyx::diag::test

@@ -66,6 +66,44 @@ void feed(const std::shared_ptr<MetricValidator>& store, const std::vector<Metri
     }
 }
 
+std::size_t feedNoise(std::span<const LogDecoderRow> table) {
+    std::uint32_t seed = 0x2545F491;
+    const auto next = [&] {
+        seed ^= seed << 13;
+        seed ^= seed >> 17;
+        seed ^= seed << 5;
+        return seed;
+    };
+    std::size_t taken = 0;
+    DecodeState state;
+    for (const LogDecoderRow& row : table) {
+        for (std::size_t length = 0; length <= 300; ++length) {
+            for (int round = 0; round < 8; ++round) {
+                Bytes payload(length);
+                // Small counts now and then, so that some packets hold all their cells.
+                for (std::uint8_t& b : payload)
+                    b = static_cast<std::uint8_t>(round % 2 == 0 ? next() : next() % 4);
+                if (!payload.empty() && row.version != kAnyVersion)
+                    payload[0] = static_cast<std::uint8_t>(row.version);
+                const Decoded d = decode(table, row.code, payload, state);
+                if (!d.decoded) continue;
+                ++taken;
+                for (const MetricOut& e : d.events) {
+                    const MetricKind* kind = findMetricKind(e.metricID);
+                    if (kind == nullptr || !kind->decodable()) {
+                        ADD_FAILURE() << row.name << " wrote an unknown kind " << e.metricID;
+                        continue;
+                    }
+                    const auto decodedEvent = kind->decode(e.payload);
+                    EXPECT_TRUE(std::holds_alternative<Dict>(decodedEvent))
+                        << row.name << ": " << kind->messageClass;
+                }
+            }
+        }
+    }
+    return taken;
+}
+
 std::string text(const Dict& dict, const std::string& key) {
     const Value* v = dict.find(key);
     return v == nullptr ? std::string() : v->description();

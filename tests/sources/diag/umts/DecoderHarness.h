@@ -38,6 +38,12 @@ struct Decoded {
 // Feeds every event to store as the intake would take it from a source.
 void feed(const std::shared_ptr<MetricValidator>& store, const std::vector<MetricOut>& events);
 
+// Feeds every row of table pseudo-random payloads of every length up to 300 bytes (the first
+// byte set to the row's version where it has one), with one state carried throughout: none
+// may read past its payload (ASan sees to it), and whatever a row writes must decode as its
+// kind's class. Returns how many payloads the rows took.
+std::size_t feedNoise(std::span<const LogDecoderRow> table);
+
 // A value of a dictionary as text ("" when absent), and the i-th element of a list in it.
 [[nodiscard]] std::string text(const Dict& dict, const std::string& key);
 [[nodiscard]] const Dict& element(const Dict& dict, const std::string& list, std::size_t index);

@@ -189,5 +189,9 @@ TEST(UmtsScreens, ServingCellInfoAndMeasurementShowTheVectorsValues) {
     EXPECT_EQ(shown("UMTS Neighbor Cell Meas", "ecno"), "-17.0");
 }
 
+TEST(UmtsDecoders, NoisePayloadsNeverReadPastTheirEndAndWhatIsWrittenDecodes) {
+    EXPECT_GT(feedNoise(umtsDecoders()), 0U);
+}
+
 }  // namespace
 }  // namespace pyx::diag::test
