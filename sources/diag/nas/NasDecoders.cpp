@@ -40,7 +40,8 @@ MetricOut activeBearers(const NasState& nas, std::uint64_t timeMs) {
 // EMM state version 2: u8 version, u8 EMM state, u16 substate, PLMN (3 B BCD), u8 GUTI valid,
 // u8 UE identity type, GUTI PLMN (3 B BCD), u16 MMEGI, u8 MMEC, u32 M-TMSI. MMEGI and M-TMSI
 // are little-endian: the captures' attach and detach requests carry the same GUTI
-// big-endian (fa e6 e9 d7 22 68 b1 for the record's e6 fa e9 b1 68 22 d7).
+// big-endian (fa e6 e9 d7 22 68 b1 for the record's e6 fa e9 b1 68 22 d7). Neither PLMN has
+// a field of ours (the TAI list is the network's list, and no TAC comes with this packet).
 // Deregistered (or EMM NULL), the modem holds no EPS bearer (TS 24.301): the bearer list
 // empties.
 bool emmState(const LogPacket& packet, DecodeState& state, std::vector<MetricOut>& out) {
