@@ -5,9 +5,13 @@
 
 namespace pyx::diag::test {
 
-std::filesystem::path sharedDiag() { return PYXON_SHARED_DIAG; }
+std::filesystem::path sharedDiag() {
+    return PYXON_SHARED_DIAG;
+}
 
-bool haveSharedDiag() { return std::filesystem::is_directory(sharedDiag()); }
+bool haveSharedDiag() {
+    return std::filesystem::is_directory(sharedDiag());
+}
 
 Bytes fromHex(const std::string& hex) {
     Bytes bytes;
