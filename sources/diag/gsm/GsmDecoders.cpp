@@ -3,6 +3,8 @@
 
 namespace pyx::diag {
 
-std::span<const LogDecoderRow> gsmDecoders() { return {}; }
+std::span<const LogDecoderRow> gsmDecoders() {
+    return {};
+}
 
 }  // namespace pyx::diag

@@ -3,6 +3,8 @@
 
 namespace pyx::diag {
 
-std::span<const LogDecoderRow> nasDecoders() { return {}; }
+std::span<const LogDecoderRow> nasDecoders() {
+    return {};
+}
 
 }  // namespace pyx::diag

@@ -3,6 +3,8 @@
 
 namespace pyx::diag {
 
-std::span<const LogDecoderRow> umtsDecoders() { return {}; }
+std::span<const LogDecoderRow> umtsDecoders() {
+    return {};
+}
 
 }  // namespace pyx::diag
