@@ -13,8 +13,8 @@ struct Fix {
     std::int64_t timeNs = 0;      // the fix's own time (UTC), ns since 1970
     std::int64_t receivedNs = 0;  // wall clock when it reached us, ns since 1970
     FixMode mode = FixMode::NoFix;
-    double lat = 0.0;  // degrees, WGS 84
-    double lon = 0.0;  // degrees, WGS 84
+    double lat = 0.0;                        // degrees, WGS 84
+    double lon = 0.0;                        // degrees, WGS 84
     std::optional<double> altM;              // metres above mean sea level
     std::optional<double> speedMps;          // metres per second over ground
     std::optional<double> trackDeg;          // degrees from true north

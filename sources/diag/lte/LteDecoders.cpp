@@ -3,8 +3,12 @@
 
 namespace pyx::diag {
 
-std::span<const LogDecoderRow> lteDecoders() { return {}; }
+std::span<const LogDecoderRow> lteDecoders() {
+    return {};
+}
 
-std::span<const EventDecoderRow> eventDecoders() { return {}; }
+std::span<const EventDecoderRow> eventDecoders() {
+    return {};
+}
 
 }  // namespace pyx::diag

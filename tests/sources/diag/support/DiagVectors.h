@@ -19,10 +19,10 @@ namespace pyx::diag::test {
 [[nodiscard]] std::filesystem::path sharedDiag();
 [[nodiscard]] bool haveSharedDiag();
 
-#define PYX_NEED_SHARED_DIAG()                                                   \
-    do {                                                                         \
-        if (!::pyx::diag::test::haveSharedDiag())                                \
-            GTEST_SKIP() << "skipped: ../shared/diag not present";               \
+#define PYX_NEED_SHARED_DIAG()                                     \
+    do {                                                           \
+        if (!::pyx::diag::test::haveSharedDiag())                  \
+            GTEST_SKIP() << "skipped: ../shared/diag not present"; \
     } while (false)
 
 // One record of vectors.jsonl (see ../shared/diag/VECTORS.md).
