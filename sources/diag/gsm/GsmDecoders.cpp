@@ -7,15 +7,15 @@
 #include "messages/Messages.h"
 #include "sources/diag/DecodeState.h"
 #include "sources/diag/LogDecoder.h"
+#include "sources/diag/decode/ByteReader.h"
 #include "sources/diag/gsm/GsmLevels.h"
-#include "sources/diag/umts/LocalReader.h"
 
 namespace pyx::diag {
 
 namespace {
 
-using local::Reader;
-namespace id = local::id;
+using decode::Reader;
+namespace id = decode::id;
 
 constexpr std::uint16_t kArfcnMask = 0x0FFF;  // b12-15 carry the modem's band code
 
@@ -47,7 +47,7 @@ bool rrCellInformation(const LogPacket& packet, DecodeState& state, std::vector<
     m.setArfcn(arfcn);
     if (bcc < 8 && ncc < 8) m.setBsic(static_cast<std::uint32_t>(ncc) * 8 + bcc);
     m.setCellId(r.u16(4));
-    if (const auto plmn = local::bcdPlmn(r.bytes(6, 3).first<3>())) {
+    if (const auto plmn = decode::bcdPlmn(r.bytes(6, 3).first<3>())) {
         m.setMcc(plmn->mcc);
         m.setMnc(plmn->mnc);
         m.setNumMncDigits(plmn->mncDigits);

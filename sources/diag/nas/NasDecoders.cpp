@@ -6,15 +6,15 @@
 #include "messages/Messages.h"
 #include "sources/diag/DecodeState.h"
 #include "sources/diag/LogDecoder.h"
+#include "sources/diag/decode/ByteReader.h"
 #include "sources/diag/nas/NasRegistration.h"
-#include "sources/diag/umts/LocalReader.h"
 
 namespace pyx::diag {
 
 namespace {
 
-using local::Reader;
-namespace id = local::id;
+using decode::Reader;
+namespace id = decode::id;
 
 constexpr std::uint8_t kFirstEpsBearerId = 5;
 constexpr std::uint8_t kLastEpsBearerId = 15;

@@ -6,16 +6,16 @@
 #include "messages/Messages.h"
 #include "sources/diag/DecodeState.h"
 #include "sources/diag/LogDecoder.h"
+#include "sources/diag/decode/ByteReader.h"
 #include "sources/diag/gsm/GsmLevels.h"
-#include "sources/diag/umts/LocalReader.h"
 #include "sources/modem/Bands.h"
 
 namespace pyx::diag {
 
 namespace {
 
-using local::Reader;
-namespace id = local::id;
+using decode::Reader;
+namespace id = decode::id;
 
 // Cell ID: u32 UL UARFCN, u32 DL UARFCN, u32 UTRAN cell id (RNC id b16-27, C-id b0-15),
 // u16 URA id, u8 flags, u8 allowed call access, u16 PSC (in b4-12), MCC[3] and MNC[3] one
@@ -31,7 +31,7 @@ bool cellId(const LogPacket& packet, DecodeState& state, std::vector<MetricOut>&
     m.setDlUarfcn(dlUarfcn);
     m.setPsc(psc);
     m.setCellId(r.u32(8));
-    if (const auto plmn = local::digitPlmn(r.bytes(18, 6).first<6>())) {
+    if (const auto plmn = decode::digitPlmn(r.bytes(18, 6).first<6>())) {
         m.setMcc(plmn->mcc);
         m.setMnc(plmn->mnc);
         m.setNumMncDigits(plmn->mncDigits);

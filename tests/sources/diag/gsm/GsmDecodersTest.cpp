@@ -6,8 +6,8 @@
 
 #include "messages/gsm/GsmEnums.h"
 #include "metrics/MetricValidator.h"
+#include "sources/diag/decode/ByteReader.h"
 #include "sources/diag/gsm/GsmLevels.h"
-#include "sources/diag/umts/LocalReader.h"
 #include "tests/sources/diag/support/DiagVectors.h"
 #include "tests/sources/diag/umts/DecoderHarness.h"
 #include "tests/sources/modem/ScreenText.h"
@@ -15,7 +15,7 @@
 namespace pyx::diag::test {
 namespace {
 
-namespace id = local::id;
+namespace id = decode::id;
 
 constexpr std::uint16_t kBaList = 0x5071;
 

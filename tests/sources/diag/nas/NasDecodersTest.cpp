@@ -8,7 +8,7 @@
 #include <sstream>
 
 #include "metrics/MetricValidator.h"
-#include "sources/diag/umts/LocalReader.h"
+#include "sources/diag/decode/ByteReader.h"
 #include "tests/sources/diag/support/DiagVectors.h"
 #include "tests/sources/diag/umts/DecoderHarness.h"
 #include "tests/sources/modem/ScreenText.h"
@@ -16,7 +16,7 @@
 namespace pyx::diag::test {
 namespace {
 
-namespace id = local::id;
+namespace id = decode::id;
 
 constexpr std::uint16_t kEmm = 0xB0EE;
 constexpr std::uint16_t kEsm = 0xB0E5;

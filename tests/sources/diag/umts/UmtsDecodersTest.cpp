@@ -5,7 +5,7 @@
 #include <cmath>
 
 #include "metrics/MetricValidator.h"
-#include "sources/diag/umts/LocalReader.h"
+#include "sources/diag/decode/ByteReader.h"
 #include "tests/sources/diag/support/DiagVectors.h"
 #include "tests/sources/diag/umts/DecoderHarness.h"
 #include "tests/sources/modem/ScreenText.h"
@@ -13,7 +13,7 @@
 namespace pyx::diag::test {
 namespace {
 
-namespace id = local::id;
+namespace id = decode::id;
 
 constexpr std::uint16_t kCellId = 0x4127;
 constexpr std::uint16_t kRanking = 0x4005;

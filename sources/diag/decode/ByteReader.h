@@ -1,5 +1,5 @@
-// Little-endian reads, PLMN digits and the catalogue's metric IDs for the UMTS, GSM and NAS
-// decoders, until the shared readers of sources/diag/decode/ take their place.
+// Little-endian reads of a log packet's fields, PLMN digits and the catalogue's metric IDs,
+// shared by the DIAG decoders of every technology.
 #pragma once
 
 #include <cstddef>
@@ -9,14 +9,14 @@
 
 #include "core/MetricKindList.h"
 
-namespace pyx::diag::local {
+namespace pyx::diag::decode {
 
 // The catalogue's metric IDs, named by their constants.
 namespace id {
 enum MetricID : std::int64_t {
-#define PYX_LOCAL_KIND_ID(constant, metricID, ...) constant = (metricID),
-    PYX_METRIC_KINDS(PYX_LOCAL_KIND_ID)
-#undef PYX_LOCAL_KIND_ID
+#define PYX_DIAG_KIND_ID(constant, metricID, ...) constant = (metricID),
+    PYX_METRIC_KINDS(PYX_DIAG_KIND_ID)
+#undef PYX_DIAG_KIND_ID
 };
 }  // namespace id
 
@@ -93,4 +93,4 @@ struct PlmnDigits {
     return p;
 }
 
-}  // namespace pyx::diag::local
+}  // namespace pyx::diag::decode
