@@ -1,0 +1,180 @@
+#include "tests/sources/diag/umts/DecoderHarness.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <fstream>
+#include <iterator>
+#include <variant>
+
+#include "metrics/MetricCatalogue.h"
+#include "tests/sources/diag/support/DiagVectors.h"
+
+namespace pyx::diag::test {
+
+const LogDecoderRow* rowFor(std::span<const LogDecoderRow> table, std::uint16_t code,
+                            std::span<const std::uint8_t> payload) {
+    for (const LogDecoderRow& row : table) {
+        if (row.code != code) continue;
+        if (row.version == kAnyVersion) return &row;
+        if (!payload.empty() && row.version == payload[0]) return &row;
+    }
+    return nullptr;
+}
+
+Decoded decode(std::span<const LogDecoderRow> table, std::uint16_t code,
+               std::span<const std::uint8_t> payload, DecodeState& state) {
+    Decoded result;
+    const LogDecoderRow* row = rowFor(table, code, payload);
+    if (row == nullptr) return result;
+    LogPacket packet;
+    packet.code = code;
+    packet.timeMs = kTimeMs;
+    packet.payload = payload;
+    result.decoded = row->decode(packet, state, result.events);
+    return result;
+}
+
+std::size_t countOf(const std::vector<MetricOut>& events, std::int64_t metricID) {
+    std::size_t n = 0;
+    for (const MetricOut& e : events) n += e.metricID == metricID ? 1 : 0;
+    return n;
+}
+
+Dict eventOf(const std::vector<MetricOut>& events, std::int64_t metricID) {
+    EXPECT_EQ(countOf(events, metricID), 1U) << std::hex << metricID;
+    for (const MetricOut& e : events) {
+        if (e.metricID != metricID) continue;
+        const MetricKind* kind = findMetricKind(metricID);
+        if (kind == nullptr || !kind->decodable()) {
+            ADD_FAILURE() << "not a decoded kind: " << std::hex << metricID;
+            return {};
+        }
+        auto decoded = kind->decode(e.payload);
+        if (const auto* dict = std::get_if<Dict>(&decoded)) return *dict;
+        ADD_FAILURE() << "does not decode as " << kind->messageClass;
+    }
+    return {};
+}
+
+void feed(const std::shared_ptr<MetricValidator>& store, const std::vector<MetricOut>& events) {
+    for (const MetricOut& e : events) {
+        Dict record;
+        record.append("kKeyMetricID", Value(e.metricID));
+        record.append("kKeyPayload", Value(e.payload));
+        EXPECT_TRUE(store->isMetricIDValidWithMetricdict(record)) << std::hex << e.metricID;
+    }
+}
+
+std::size_t feedNoise(std::span<const LogDecoderRow> table) {
+    std::uint32_t seed = 0x2545F491;
+    const auto next = [&] {
+        seed ^= seed << 13;
+        seed ^= seed >> 17;
+        seed ^= seed << 5;
+        return seed;
+    };
+    std::size_t taken = 0;
+    DecodeState state;
+    for (const LogDecoderRow& row : table) {
+        for (std::size_t length = 0; length <= 300; ++length) {
+            for (int round = 0; round < 8; ++round) {
+                Bytes payload(length);
+                // Small counts now and then, so that some packets hold all their cells.
+                for (std::uint8_t& b : payload)
+                    b = static_cast<std::uint8_t>(round % 2 == 0 ? next() : next() % 4);
+                if (!payload.empty() && row.version != kAnyVersion)
+                    payload[0] = static_cast<std::uint8_t>(row.version);
+                const Decoded d = decode(table, row.code, payload, state);
+                if (!d.decoded) continue;
+                ++taken;
+                for (const MetricOut& e : d.events) {
+                    const MetricKind* kind = findMetricKind(e.metricID);
+                    if (kind == nullptr || !kind->decodable()) {
+                        ADD_FAILURE() << row.name << " wrote an unknown kind " << e.metricID;
+                        continue;
+                    }
+                    const auto decodedEvent = kind->decode(e.payload);
+                    EXPECT_TRUE(std::holds_alternative<Dict>(decodedEvent))
+                        << row.name << ": " << kind->messageClass;
+                }
+            }
+        }
+    }
+    return taken;
+}
+
+std::string text(const Dict& dict, const std::string& key) {
+    const Value* v = dict.find(key);
+    return v == nullptr ? std::string() : v->description();
+}
+
+std::size_t lengthOf(const Dict& dict, const std::string& list) {
+    const Value* v = dict.find(list);
+    return v != nullptr && v->isArray() ? v->asArray().size() : 0;
+}
+
+const Dict& element(const Dict& dict, const std::string& list, std::size_t index) {
+    static const Dict kEmpty;
+    const Value* v = dict.find(list);
+    if (v == nullptr || !v->isArray() || index >= v->asArray().size() ||
+        !v->asArray()[index].isDict()) {
+        ADD_FAILURE() << "no element " << index << " in " << list;
+        return kEmpty;
+    }
+    return v->asArray()[index].asDict();
+}
+
+namespace {
+
+// CRC-16/X-25 of a frame's unescaped bytes.
+std::uint16_t crc16(std::span<const std::uint8_t> bytes) {
+    std::uint16_t crc = 0xFFFF;
+    for (const std::uint8_t b : bytes) {
+        crc ^= b;
+        for (int i = 0; i < 8; ++i)
+            crc = static_cast<std::uint16_t>(crc & 1 ? (crc >> 1) ^ 0x8408 : crc >> 1);
+    }
+    return static_cast<std::uint16_t>(~crc);
+}
+
+}  // namespace
+
+std::vector<Bytes> capturePayloads(const std::string& file, std::uint16_t code) {
+    std::vector<Bytes> payloads;
+    for (CapturedPacket& packet : capturePackets(file, std::span(&code, 1)))
+        payloads.push_back(std::move(packet.payload));
+    return payloads;
+}
+
+std::vector<CapturedPacket> capturePackets(const std::string& file,
+                                           std::span<const std::uint16_t> codes) {
+    std::ifstream in(sharedDiag() / "captures" / file, std::ios::binary);
+    const Bytes raw{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+    std::vector<CapturedPacket> packets;
+    Bytes frame;
+    for (std::size_t i = 0; i < raw.size(); ++i) {
+        if (raw[i] != 0x7E) {
+            if (raw[i] == 0x7D && i + 1 < raw.size())
+                frame.push_back(static_cast<std::uint8_t>(raw[++i] ^ 0x20));
+            else
+                frame.push_back(raw[i]);
+            continue;
+        }
+        std::span<const std::uint8_t> body(frame);
+        if (body.size() >= 3 && crc16(body.first(body.size() - 2)) ==
+                                    (body[body.size() - 2] | body[body.size() - 1] << 8)) {
+            body = body.first(body.size() - 2);
+            if (body[0] == 0x98 && body.size() > 8) body = body.subspan(8);
+            const auto code =
+                static_cast<std::uint16_t>(body.size() >= 16 ? body[6] | body[7] << 8 : 0);
+            if (body[0] == 0x10 && body.size() >= 16 &&
+                std::find(codes.begin(), codes.end(), code) != codes.end())
+                packets.push_back({code, Bytes(body.begin() + 16, body.end())});
+        }
+        frame.clear();
+    }
+    return packets;
+}
+
+}  // namespace pyx::diag::test
