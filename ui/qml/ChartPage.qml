@@ -138,6 +138,7 @@ FocusScope {
 
                 ChartView {
                     id: view
+                    objectName: "chartView"
                     anchors { left: parent.left; right: parent.right; top: parent.top; bottom: legend.top }
                     antialiasing: true
                     animationOptions: ChartView.NoAnimation
@@ -215,6 +216,7 @@ FocusScope {
                         owners.push(page.chart.segmentLine(panel.index, k))
                     const signature = names.join("\n") + "|" + owners.join(",") + "|" + page.dark
                     if (signature !== panel.shown) {
+                        panel.range = ""
                         view.removeAllSeries()
                         for (let k = 0; k < segments; ++k) {
                             const line = view.createSeries(ChartView.SeriesTypeLine, names[owners[k]], timeAxis, valueAxis)
@@ -225,11 +227,33 @@ FocusScope {
                         panel.shown = signature
                     }
                     moveWindow()
-                    valueAxis.min = page.chart.minimum(panel.index)
-                    valueAxis.max = page.chart.maximum(panel.index)
-                    valueAxis.applyNiceNumbers()
+                    setRange()
                     for (let k = 0; k < view.count; ++k)
                         page.chart.fill(panel.index, k, view.series(k))
+                }
+
+                // The same lines as drawn: each takes only its new and its departed points (the window
+                // follows on windowMoved).
+                function extend() {
+                    if (!page.chart || panel.index >= page.chart.panelCount)
+                        return
+                    setRange()
+                    for (let k = 0; k < view.count; ++k)
+                        page.chart.extend(panel.index, k, view.series(k))
+                }
+
+                // The value axis is set (and laid out again) only when its range moved.
+                property string range: ""
+                function setRange() {
+                    const low = page.chart.minimum(panel.index)
+                    const high = page.chart.maximum(panel.index)
+                    const key = low + ":" + high
+                    if (key === panel.range)
+                        return
+                    valueAxis.min = low
+                    valueAxis.max = high
+                    valueAxis.applyNiceNumbers()
+                    panel.range = key
                 }
 
                 function moveWindow() {
@@ -241,6 +265,7 @@ FocusScope {
                 Connections {
                     target: page.chart
                     function onChanged() { panel.redraw() }
+                    function onExtended() { panel.extend() }
                     function onWindowMoved() { panel.moveWindow() }
                 }
             }

@@ -4,6 +4,12 @@
 // history only when points were added to this chart (or the history started over), or when a
 // line it draws leaves the window. When only the time moved on (other kinds arrived), the
 // window follows it: the time axis scrolls and nothing else is read.
+//
+// A page is open all day, so a refresh that finds the same lines as before (the common case:
+// a point or two more, the oldest ones leaving the window) does not have the page redraw
+// them: it keeps, per segment, what changed since the last refresh, and the page applies just
+// that to its line series (extend()). The work per refresh depends on the window, never on
+// how long the program has run.
 #pragma once
 
 #include <QList>
@@ -70,34 +76,54 @@ class ChartModel : public QObject {
     Q_INVOKABLE int segmentLine(int panel, int segment) const;
     // The points of a segment: x in ms since 1970, each slot as its minimum and maximum in
     // the order they came.
-    [[nodiscard]] QList<QPointF> points(int panel, int segment) const;
+    Q_INVOKABLE QList<QPointF> points(int panel, int segment) const;
     // Puts those points into a line series of the chart view (replacing its points).
     Q_INVOKABLE void fill(int panel, int segment, QObject* series) const;
+    // After extended(): brings a line series that holds the segment's points of the refresh
+    // before to its points now, by dropping the points that left the window and replacing the
+    // tail that changed (the newest slot) and was added. A series that does not hold the points
+    // of the refresh before is filled afresh.
+    Q_INVOKABLE void extend(int panel, int segment, QObject* series) const;
 
     // Reads the history again if points were added to the chart since it was last read, or a
-    // line would leave the window, and emits changed (and windowMoved); when only the newest
-    // time moved on, moves the window to it and emits windowMoved alone.
+    // line would leave the window, and emits changed (and windowMoved), or extended (and
+    // windowMoved) when the panels, lines and segments are the ones drawn already; when only
+    // the newest time moved on, moves the window to it and emits windowMoved alone.
     Q_INVOKABLE void refresh();
 
   signals:
     // The lines, panels and texts changed (the window too).
     void changed();
+    // The same lines, segments and texts as before; points were added, changed or left the
+    // window, and the value range may have moved (the window too): extend() each segment.
+    void extended();
     // The window's times changed.
     void windowMoved();
     void windowMinutesChanged();
 
   private:
+    // How a segment's points differ from the refresh before: its first `dropped` points left
+    // the window, the next `kept` are as they were, and the rest replace the old tail.
+    struct Change {
+        int before = -1;  // the points the segment had; -1: not drawn before
+        int dropped = 0;
+        int kept = 0;
+    };
     struct Panel {
         Unit unit = Unit::Dbm;
         QStringList names;
         QString caption;
         std::vector<QList<QPointF>> segments;
         std::vector<int> segmentLines;
+        std::vector<Change> changes;  // one per segment, after extended()
         double minimum = 0;
         double maximum = 0;
     };
     [[nodiscard]] const Panel* panelAt(int panel) const;
     void rebuild();
+    // Whether the panels now draw the same lines and segments as before, and if so each
+    // segment's change since.
+    [[nodiscard]] bool sameShape(const std::vector<Panel>& before);
 
     std::shared_ptr<const History> history_;
     Chart chart_;
