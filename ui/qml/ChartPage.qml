@@ -232,7 +232,7 @@ FocusScope {
                         page.chart.fill(panel.index, k, view.series(k))
                 }
 
-                // The same lines as drawn: each takes only its new and its departed points (the window
+                // The same lines as drawn: only those whose points changed take them (the window
                 // follows on windowMoved).
                 function extend() {
                     if (!page.chart || panel.index >= page.chart.panelCount)
@@ -257,8 +257,7 @@ FocusScope {
                 }
 
                 function moveWindow() {
-                    timeAxis.min = new Date(page.chart.fromMs)
-                    timeAxis.max = new Date(page.chart.toMs)
+                    page.chart.showWindow(timeAxis)
                 }
 
                 Component.onCompleted: redraw()

@@ -1,5 +1,7 @@
 #include "ui/qt/ChartModel.h"
 
+#include <QDateTime>
+#include <QDateTimeAxis>
 #include <QXYSeries>
 
 #include <algorithm>
@@ -120,45 +122,30 @@ void ChartModel::extend(int panel, int index, QObject* series) const {
         index >= static_cast<int>(p->segments.size()))
         return;
     const auto at = static_cast<std::size_t>(index);
-    const Change& change = p->changes[at];
-    const QList<QPointF>& now = p->segments[at];
-    if (change.before < 0 || line->count() != change.before) {
-        line->replace(now);
-        return;
-    }
-    if (change.dropped > 0) line->removePoints(0, change.dropped);
-    if (line->count() > change.kept) line->removePoints(change.kept, line->count() - change.kept);
-    if (now.size() > change.kept) line->append(now.mid(change.kept));
+    if (p->changes[at] != Change::Same || line->count() != p->segments[at].size())
+        line->replace(p->segments[at]);
+}
+
+void ChartModel::showWindow(QObject* axis) const {
+    if (auto* const time = qobject_cast<QDateTimeAxis*>(axis))
+        time->setRange(QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(fromMs_)),
+                       QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(toMs_)));
 }
 
 bool ChartModel::sameShape(const std::vector<Panel>& before) {
     if (before.size() != panels_.size()) return false;
     for (std::size_t i = 0; i < panels_.size(); ++i) {
         const Panel& old = before[i];
-        Panel& now = panels_[i];
+        const Panel& now = panels_[i];
         if (old.unit != now.unit || old.names != now.names || old.caption != now.caption ||
             old.segmentLines != now.segmentLines)
             return false;
     }
     for (std::size_t i = 0; i < panels_.size(); ++i) {
-        const Panel& old = before[i];
         Panel& now = panels_[i];
-        for (std::size_t k = 0; k < now.segments.size(); ++k) {
-            const QList<QPointF>& was = old.segments[k];
-            const QList<QPointF>& is = now.segments[k];
-            Change& change = now.changes[k];
-            change.before = static_cast<int>(was.size());
-            // The points that left the window come first; is starts at or after them.
-            qsizetype dropped = 0;
-            if (!is.isEmpty())
-                while (dropped < was.size() && was[dropped].x() < is.front().x()) ++dropped;
-            qsizetype kept = 0;
-            while (dropped + kept < was.size() && kept < is.size() &&
-                   was[dropped + kept] == is[kept])
-                ++kept;
-            change.dropped = static_cast<int>(dropped);
-            change.kept = static_cast<int>(kept);
-        }
+        for (std::size_t k = 0; k < now.segments.size(); ++k)
+            now.changes[k] =
+                before[i].segments[k] == now.segments[k] ? Change::Same : Change::Changed;
     }
     return true;
 }
@@ -264,7 +251,7 @@ void ChartModel::rebuild() {
                 panel.segmentLines.push_back(lineIndex);
             }
         }
-        panel.changes.assign(panel.segments.size(), Change{});
+        panel.changes.assign(panel.segments.size(), Change::Unknown);
         // Room above and below the lines, and at least a few units of range.
         const double span = std::max(high - low, 4.0);
         const double middle = (high + low) / 2;

@@ -6,10 +6,11 @@
 // window follows it: the time axis scrolls and nothing else is read.
 //
 // A page is open all day, so a refresh that finds the same lines as before (the common case:
-// a point or two more, the oldest ones leaving the window) does not have the page redraw
-// them: it keeps, per segment, what changed since the last refresh, and the page applies just
-// that to its line series (extend()). The work per refresh depends on the window, never on
-// how long the program has run.
+// a point or two more, the oldest ones leaving the window) does not have the page rebuild
+// them: it notes which segments changed, the page hands only those their points (extend()),
+// and each change to the chart is one change (the window's two ends move together), since
+// Qt Charts lays out every line again on each. The work per refresh depends on the window,
+// never on how long the program has run.
 #pragma once
 
 #include <QList>
@@ -79,11 +80,13 @@ class ChartModel : public QObject {
     Q_INVOKABLE QList<QPointF> points(int panel, int segment) const;
     // Puts those points into a line series of the chart view (replacing its points).
     Q_INVOKABLE void fill(int panel, int segment, QObject* series) const;
-    // After extended(): brings a line series that holds the segment's points of the refresh
-    // before to its points now, by dropping the points that left the window and replacing the
-    // tail that changed (the newest slot) and was added. A series that does not hold the points
-    // of the refresh before is filled afresh.
+    // After extended(): gives a line series the segment's points when they changed since the
+    // refresh before (one change, so the chart lays the line out once); a series whose points
+    // are as they were is left alone.
     Q_INVOKABLE void extend(int panel, int segment, QObject* series) const;
+    // Sets a date-time axis to the window in one change (its minimum and maximum set one after
+    // the other would lay every line out twice).
+    Q_INVOKABLE void showWindow(QObject* axis) const;
 
     // Reads the history again if points were added to the chart since it was last read, or a
     // line would leave the window, and emits changed (and windowMoved), or extended (and
@@ -102,13 +105,8 @@ class ChartModel : public QObject {
     void windowMinutesChanged();
 
   private:
-    // How a segment's points differ from the refresh before: its first `dropped` points left
-    // the window, the next `kept` are as they were, and the rest replace the old tail.
-    struct Change {
-        int before = -1;  // the points the segment had; -1: not drawn before
-        int dropped = 0;
-        int kept = 0;
-    };
+    // Whether a segment's points differ from the refresh before.
+    enum class Change { Unknown, Same, Changed };
     struct Panel {
         Unit unit = Unit::Dbm;
         QStringList names;
