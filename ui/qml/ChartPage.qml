@@ -132,6 +132,7 @@ FocusScope {
                 required property int index
                 property string shown: ""
                 property var names: []
+                readonly property alias timeAxis: timeAxis
                 objectName: "panel" + index
                 width: panels.width
                 height: panels.height / Math.max(1, page.chart.panelCount)
@@ -226,7 +227,7 @@ FocusScope {
                         panel.names = names
                         panel.shown = signature
                     }
-                    moveWindow()
+                    moveWindow(true)
                     setRange()
                     for (let k = 0; k < view.count; ++k)
                         page.chart.fill(panel.index, k, view.series(k))
@@ -256,8 +257,17 @@ FocusScope {
                     panel.range = key
                 }
 
-                function moveWindow() {
+                // The newest time the axis ends at. The axis moves only when that moves by a
+                // pixel or more (at 30 minutes a second is a fraction of one): nothing is laid
+                // out again for a move no one can see.
+                property real shownToMs: 0
+                function moveWindow(always) {
+                    const spanMs = page.chart.toMs - page.chart.fromMs
+                    const pixels = Math.abs(page.chart.toMs - panel.shownToMs) * view.plotArea.width / spanMs
+                    if (!always && spanMs > 0 && pixels < 1)
+                        return
                     page.chart.showWindow(timeAxis)
+                    panel.shownToMs = page.chart.toMs
                 }
 
                 Component.onCompleted: redraw()
@@ -265,7 +275,7 @@ FocusScope {
                     target: page.chart
                     function onChanged() { panel.redraw() }
                     function onExtended() { panel.extend() }
-                    function onWindowMoved() { panel.moveWindow() }
+                    function onWindowMoved() { panel.moveWindow(false) }
                 }
             }
         }

@@ -216,6 +216,15 @@ TestCase {
         compare(page.chart.toMs, start + 60000)
         compare(page.chart.fromMs, start + 60000 - 5 * 60000)
         verify(!page.chart.empty)
+        const axis = findChild(page, "panel0").timeAxis
+        compare(axis.max.getTime(), start + 60000)
+        compare(axis.min.getTime(), start + 60000 - 5 * 60000)
+        // A move of less than a pixel is not drawn; the model follows all the same.
+        lteTxPower(20, start + 60010)
+        page.chart.refresh()
+        compare(movedSpy.count, 2)
+        compare(page.chart.toMs, start + 60010)
+        compare(axis.max.getTime(), start + 60000)
 
         // Once the GSM line is older than the window, the page says so.
         lteTxPower(21, start + 6 * 60000)
