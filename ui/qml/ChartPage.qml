@@ -132,12 +132,14 @@ FocusScope {
                 required property int index
                 property string shown: ""
                 property var names: []
+                readonly property alias timeAxis: timeAxis
                 objectName: "panel" + index
                 width: panels.width
                 height: panels.height / Math.max(1, page.chart.panelCount)
 
                 ChartView {
                     id: view
+                    objectName: "chartView"
                     anchors { left: parent.left; right: parent.right; top: parent.top; bottom: legend.top }
                     antialiasing: true
                     animationOptions: ChartView.NoAnimation
@@ -215,6 +217,7 @@ FocusScope {
                         owners.push(page.chart.segmentLine(panel.index, k))
                     const signature = names.join("\n") + "|" + owners.join(",") + "|" + page.dark
                     if (signature !== panel.shown) {
+                        panel.range = ""
                         view.removeAllSeries()
                         for (let k = 0; k < segments; ++k) {
                             const line = view.createSeries(ChartView.SeriesTypeLine, names[owners[k]], timeAxis, valueAxis)
@@ -224,24 +227,55 @@ FocusScope {
                         panel.names = names
                         panel.shown = signature
                     }
-                    moveWindow()
-                    valueAxis.min = page.chart.minimum(panel.index)
-                    valueAxis.max = page.chart.maximum(panel.index)
-                    valueAxis.applyNiceNumbers()
+                    moveWindow(true)
+                    setRange()
                     for (let k = 0; k < view.count; ++k)
                         page.chart.fill(panel.index, k, view.series(k))
                 }
 
-                function moveWindow() {
-                    timeAxis.min = new Date(page.chart.fromMs)
-                    timeAxis.max = new Date(page.chart.toMs)
+                // The same lines as drawn: only those whose points changed take them (the window
+                // follows on windowMoved).
+                function extend() {
+                    if (!page.chart || panel.index >= page.chart.panelCount)
+                        return
+                    setRange()
+                    for (let k = 0; k < view.count; ++k)
+                        page.chart.extend(panel.index, k, view.series(k))
+                }
+
+                // The value axis is set (and laid out again) only when its range moved.
+                property string range: ""
+                function setRange() {
+                    const low = page.chart.minimum(panel.index)
+                    const high = page.chart.maximum(panel.index)
+                    const key = low + ":" + high
+                    if (key === panel.range)
+                        return
+                    valueAxis.min = low
+                    valueAxis.max = high
+                    valueAxis.applyNiceNumbers()
+                    panel.range = key
+                }
+
+                // The newest time the axis ends at. The axis moves only when that moves by a
+                // pixel or more (at 30 minutes a second is a fraction of one): nothing is laid
+                // out again for a move no one can see.
+                property real shownToMs: 0
+                function moveWindow(always) {
+                    const spanMs = page.chart.toMs - page.chart.fromMs
+                    const pixels = Math.abs(page.chart.toMs - panel.shownToMs) * view.plotArea.width / spanMs
+                    if (!always && spanMs > 0 && pixels < 1)
+                        return
+                    page.chart.showWindow(timeAxis)
+                    panel.shownToMs = page.chart.toMs
                 }
 
                 Component.onCompleted: redraw()
                 Connections {
                     target: page.chart
                     function onChanged() { panel.redraw() }
-                    function onWindowMoved() { panel.moveWindow() }
+                    function onExtended() { panel.extend() }
+                    function onWindowMoved() { panel.moveWindow(false) }
                 }
             }
         }

@@ -1,5 +1,7 @@
 #include "ui/qt/ChartModel.h"
 
+#include <QDateTime>
+#include <QDateTimeAxis>
 #include <QXYSeries>
 
 #include <algorithm>
@@ -14,6 +16,21 @@ namespace {
 // its mean spacing in the window (so that a quantity reported seldom still draws a line).
 constexpr double kGapMs = 10'000;
 constexpr double kGapSpacings = 5;
+
+// The index of a ring's first bucket at fromMs or later (its buckets are in time order), so
+// that reading the window costs what the window holds, not what the ring holds.
+std::size_t firstInWindow(const SeriesRing& ring, double fromMs) {
+    std::size_t low = 0;
+    std::size_t high = ring.size();
+    while (low < high) {
+        const std::size_t middle = low + (high - low) / 2;
+        if (ring.at(middle).timeMs < fromMs)
+            low = middle + 1;
+        else
+            high = middle;
+    }
+    return low;
+}
 
 }  // namespace
 
@@ -98,14 +115,54 @@ void ChartModel::fill(int panel, int index, QObject* series) const {
     if (auto* const line = qobject_cast<QXYSeries*>(series)) line->replace(points(panel, index));
 }
 
+void ChartModel::extend(int panel, int index, QObject* series) const {
+    auto* const line = qobject_cast<QXYSeries*>(series);
+    const Panel* p = panelAt(panel);
+    if (line == nullptr || p == nullptr || index < 0 ||
+        index >= static_cast<int>(p->segments.size()))
+        return;
+    const auto at = static_cast<std::size_t>(index);
+    if (p->changes[at] != Change::Same || line->count() != p->segments[at].size())
+        line->replace(p->segments[at]);
+}
+
+void ChartModel::showWindow(QObject* axis) const {
+    if (auto* const time = qobject_cast<QDateTimeAxis*>(axis))
+        time->setRange(QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(fromMs_)),
+                       QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(toMs_)));
+}
+
+bool ChartModel::sameShape(const std::vector<Panel>& before) {
+    if (before.size() != panels_.size()) return false;
+    for (std::size_t i = 0; i < panels_.size(); ++i) {
+        const Panel& old = before[i];
+        const Panel& now = panels_[i];
+        if (old.unit != now.unit || old.names != now.names || old.caption != now.caption ||
+            old.segmentLines != now.segmentLines)
+            return false;
+    }
+    for (std::size_t i = 0; i < panels_.size(); ++i) {
+        Panel& now = panels_[i];
+        for (std::size_t k = 0; k < now.segments.size(); ++k)
+            now.changes[k] =
+                before[i].segments[k] == now.segments[k] ? Change::Same : Change::Changed;
+    }
+    return true;
+}
+
 void ChartModel::refresh() {
     const double newestMs = history_->newestMs().value_or(0);
     const double windowMs = windowMinutes_ * 60'000.0;
     const bool moved = newestMs != toMs_;
     if (history_->revision(chart_) != readRevision_ ||
         (moved && !panels_.empty() && newestMs - windowMs > leavesAfterMs_)) {
+        const std::vector<Panel> before = std::move(panels_);
+        const QString missingBefore = missingText_;
         rebuild();
-        emit changed();
+        if (missingText_ == missingBefore && sameShape(before))
+            emit extended();
+        else
+            emit changed();
         emit windowMoved();
     } else if (moved) {
         toMs_ = newestMs;
@@ -147,6 +204,7 @@ void ChartModel::rebuild() {
                 pairs ? QString::fromUtf8(q.labelA) + '/' + QString::fromUtf8(q.labelB) : QString(),
                 {},
                 {},
+                {},
                 0,
                 0});
         }
@@ -162,19 +220,15 @@ void ChartModel::rebuild() {
             panel.names << QString::fromStdString(s->label());
             QList<QPointF> line;
             const SeriesRing& ring = s->points();
-            std::size_t shown = 0;
-            double firstMs = 0;
-            for (std::size_t i = 0; i < ring.size(); ++i) {
-                if (ring.at(i).timeMs < fromMs_) continue;
-                if (shown++ == 0) firstMs = ring.at(i).timeMs;
-            }
+            const std::size_t first = firstInWindow(ring, fromMs_);
+            const std::size_t shown = ring.size() - first;
+            const double firstMs = shown > 0 ? ring.at(first).timeMs : 0;
             const double spacing =
                 shown > 1 ? (ring.newest().timeMs - firstMs) / static_cast<double>(shown - 1) : 0;
             const double gapMs = std::max(kGapMs, kGapSpacings * spacing);
             double previousMs = -std::numeric_limits<double>::infinity();
-            for (std::size_t i = 0; i < ring.size(); ++i) {
+            for (std::size_t i = first; i < ring.size(); ++i) {
                 const Bucket& b = ring.at(i);
-                if (b.timeMs < fromMs_) continue;
                 if (b.timeMs - previousMs > gapMs && !line.isEmpty()) {
                     panel.segments.push_back(std::move(line));
                     panel.segmentLines.push_back(lineIndex);
@@ -197,6 +251,7 @@ void ChartModel::rebuild() {
                 panel.segmentLines.push_back(lineIndex);
             }
         }
+        panel.changes.assign(panel.segments.size(), Change::Unknown);
         // Room above and below the lines, and at least a few units of range.
         const double span = std::max(high - low, 4.0);
         const double middle = (high + low) / 2;

@@ -4,6 +4,13 @@
 // history only when points were added to this chart (or the history started over), or when a
 // line it draws leaves the window. When only the time moved on (other kinds arrived), the
 // window follows it: the time axis scrolls and nothing else is read.
+//
+// A page is open all day, so a refresh that finds the same lines as before (the common case:
+// a point or two more, the oldest ones leaving the window) does not have the page rebuild
+// them: it notes which segments changed, the page hands only those their points (extend()),
+// and each change to the chart is one change (the window's two ends move together), since
+// Qt Charts lays out every line again on each. The work per refresh depends on the window,
+// never on how long the program has run.
 #pragma once
 
 #include <QList>
@@ -70,34 +77,51 @@ class ChartModel : public QObject {
     Q_INVOKABLE int segmentLine(int panel, int segment) const;
     // The points of a segment: x in ms since 1970, each slot as its minimum and maximum in
     // the order they came.
-    [[nodiscard]] QList<QPointF> points(int panel, int segment) const;
+    Q_INVOKABLE QList<QPointF> points(int panel, int segment) const;
     // Puts those points into a line series of the chart view (replacing its points).
     Q_INVOKABLE void fill(int panel, int segment, QObject* series) const;
+    // After extended(): gives a line series the segment's points when they changed since the
+    // refresh before (one change, so the chart lays the line out once); a series whose points
+    // are as they were is left alone.
+    Q_INVOKABLE void extend(int panel, int segment, QObject* series) const;
+    // Sets a date-time axis to the window in one change (its minimum and maximum set one after
+    // the other would lay every line out twice).
+    Q_INVOKABLE void showWindow(QObject* axis) const;
 
     // Reads the history again if points were added to the chart since it was last read, or a
-    // line would leave the window, and emits changed (and windowMoved); when only the newest
-    // time moved on, moves the window to it and emits windowMoved alone.
+    // line would leave the window, and emits changed (and windowMoved), or extended (and
+    // windowMoved) when the panels, lines and segments are the ones drawn already; when only
+    // the newest time moved on, moves the window to it and emits windowMoved alone.
     Q_INVOKABLE void refresh();
 
   signals:
     // The lines, panels and texts changed (the window too).
     void changed();
+    // The same lines, segments and texts as before; points were added, changed or left the
+    // window, and the value range may have moved (the window too): extend() each segment.
+    void extended();
     // The window's times changed.
     void windowMoved();
     void windowMinutesChanged();
 
   private:
+    // Whether a segment's points differ from the refresh before.
+    enum class Change { Unknown, Same, Changed };
     struct Panel {
         Unit unit = Unit::Dbm;
         QStringList names;
         QString caption;
         std::vector<QList<QPointF>> segments;
         std::vector<int> segmentLines;
+        std::vector<Change> changes;  // one per segment, after extended()
         double minimum = 0;
         double maximum = 0;
     };
     [[nodiscard]] const Panel* panelAt(int panel) const;
     void rebuild();
+    // Whether the panels now draw the same lines and segments as before, and if so each
+    // segment's change since.
+    [[nodiscard]] bool sameShape(const std::vector<Panel>& before);
 
     std::shared_ptr<const History> history_;
     Chart chart_;

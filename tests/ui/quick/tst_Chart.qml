@@ -27,6 +27,11 @@ TestCase {
         signalName: "windowMoved"
     }
 
+    SignalSpy {
+        id: extendedSpy
+        signalName: "extended"
+    }
+
     function init() {
         testNavigator.popToRoot()
         testNavigator.animated = false
@@ -134,8 +139,62 @@ TestCase {
         compare(changedSpy.count, 0)
         idle(-81, start + 2000)
         page.chart.refresh()
-        compare(changedSpy.count, 1)
+        compare(changedSpy.count, 0)
         compare(page.chart.toMs, start + 2000)
+        compare(page.chart.points(0, 0).length, 2)
+    }
+
+    // What the page draws: the line series of the first panel's chart view.
+    function drawnMatchesTheModel(page, segment) {
+        const drawn = findChild(findChild(page, "panel0"), "chartView").series(segment)
+        const points = page.chart.points(0, segment)
+        compare(drawn.count, points.length)
+        for (let i = 0; i < points.length; ++i) {
+            compare(drawn.at(i).x, points[i].x)
+            compare(drawn.at(i).y, points[i].y)
+        }
+    }
+
+    function test_newPointsExtendTheDrawnLinesWithoutRedrawingThem() {
+        idle(-82, start)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chart = page.chart
+        mouseClick(findChild(page, "window1"))
+        changedSpy.target = chart
+        extendedSpy.target = chart
+        changedSpy.clear()
+        extendedSpy.clear()
+        // Two minutes of a point every two seconds: the first minute's points leave the window.
+        for (let i = 1; i <= 60; ++i) {
+            idle(-82 + (i % 7), start + i * 2000)
+            chart.refresh()
+            drawnMatchesTheModel(page, 0)
+        }
+        compare(changedSpy.count, 0)
+        compare(extendedSpy.count, 60)
+        compare(chart.segmentCount(0), 1)
+        const points = chart.points(0, 0)
+        verify(points[0].x >= chart.fromMs, points[0].x)
+        compare(points[points.length - 1].x, start + 120000)
+        // A value within the newest slot changes the newest point(s) in place.
+        idle(-60, start + 120500)
+        chart.refresh()
+        compare(extendedSpy.count, 61)
+        drawnMatchesTheModel(page, 0)
+        compare(chart.maximum(0) >= -60, true)
+        // After a pause the line breaks: a new segment is a new line series.
+        idle(-75, start + 140000)
+        chart.refresh()
+        compare(changedSpy.count, 1)
+        compare(chart.segmentCount(0), 2)
+        drawnMatchesTheModel(page, 0)
+        drawnMatchesTheModel(page, 1)
+        // And the next point extends the new segment.
+        idle(-74, start + 142000)
+        chart.refresh()
+        compare(changedSpy.count, 1)
+        compare(extendedSpy.count, 62)
+        drawnMatchesTheModel(page, 1)
     }
 
     function lteTxPower(dBm, atMs) {
@@ -157,6 +216,15 @@ TestCase {
         compare(page.chart.toMs, start + 60000)
         compare(page.chart.fromMs, start + 60000 - 5 * 60000)
         verify(!page.chart.empty)
+        const axis = findChild(page, "panel0").timeAxis
+        compare(axis.max.getTime(), start + 60000)
+        compare(axis.min.getTime(), start + 60000 - 5 * 60000)
+        // A move of less than a pixel is not drawn; the model follows all the same.
+        lteTxPower(20, start + 60010)
+        page.chart.refresh()
+        compare(movedSpy.count, 2)
+        compare(page.chart.toMs, start + 60010)
+        compare(axis.max.getTime(), start + 60000)
 
         // Once the GSM line is older than the window, the page says so.
         lteTxPower(21, start + 6 * 60000)
