@@ -88,10 +88,10 @@ int runPyxon(int argc, char** argv) {
     }
 #ifdef PYXON_HAVE_WINDOW
     const bool window = !options.headless && (options.screenshots || displayAvailable());
-    if (!options.headless && !window) systemLog("pyxon: no display available, running headless");
+    if (!options.headless && !window) systemFault("pyxon: no display available, running headless");
 #else
     const bool window = false;
-    if (!options.headless) systemLog("pyxon: built without the window, running headless");
+    if (!options.headless) systemFault("pyxon: built without the window, running headless");
 #endif
     if (options.screenshots && !window) {
         std::cerr << "pyxon: --screenshots needs the window\n";

@@ -18,7 +18,7 @@ RejectedRecords::RejectedRecords(MainQueue& queue) : queue_(queue) {
                 rejection.metricID()
                     ? format("0x%llX", static_cast<unsigned long long>(*rejection.metricID()))
                     : std::string("(none)");
-            systemLog(format("pyxon: rejected metric record %s: %s", id.c_str(),
+            systemFault(format("pyxon: rejected metric record %s: %s", id.c_str(),
                              rejection.reason().c_str()));
         }
     });
@@ -27,7 +27,7 @@ RejectedRecords::RejectedRecords(MainQueue& queue) : queue_(queue) {
 RejectedRecords::~RejectedRecords() {
     queue_.setErrorHandler({});
     if (count_ > 0)
-        systemLog(format("pyxon: %llu metric records rejected in all",
+        systemFault(format("pyxon: %llu metric records rejected in all",
                          static_cast<unsigned long long>(count_)));
 }
 

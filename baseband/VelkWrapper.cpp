@@ -134,9 +134,11 @@ void VelkWrapper::listen() {
             const std::shared_ptr<VelkWrapper> self = weak.lock();
             if (!self) return;
             Value record(metricRecordFromEvent(event));
-            systemLog(format(kind == EventKind::Trigger ? "%s: EventTrigger dict=%s"
-                                                        : "%s: MetricsTrigger dict=%s",
-                             kHandlerName, record.description().c_str()));
+            // The whole record with its payload in hex: built only when someone reads it.
+            if (systemLogSink().on())
+                systemLog(format(kind == EventKind::Trigger ? "%s: EventTrigger dict=%s"
+                                                            : "%s: MetricsTrigger dict=%s",
+                                 kHandlerName, record.description().c_str()));
             // With no delegate at this moment, the event ends here.
             if (!self->impl_->currentDelegate()) return;
             // The task holds the wrapper weakly too, so that a wrapper that goes away (at the

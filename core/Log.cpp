@@ -15,6 +15,10 @@ std::mutex& sinkMutex() {
 }  // namespace
 
 void LineSink::write(std::string_view text) {
+    if (on()) writeAlways(text);
+}
+
+void LineSink::writeAlways(std::string_view text) {
     const std::lock_guard lock(sinkMutex());
     if (writer_) {
         writer_(text);

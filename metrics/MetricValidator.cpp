@@ -101,7 +101,8 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
     }
     const std::int64_t id = *self.metricID_;
 
-    standardOutput(HexLine(id));
+    const bool logging = standardOutputSink().on();
+    if (logging) standardOutput(HexLine(id));
 
     const MetricKind* kind = findMetricKind(id);
     if (kind == nullptr || !kind->decodable()) {
@@ -163,10 +164,12 @@ bool MetricValidator::Impl::take(MetricValidator& self, const MetricRecord& reco
 
     const auto& now = self.dictionary(property);
     if (self.history_ && now) self.history_->record(property, *now, milliseconds);
-    std::string& line = self.arrivalLine_;
-    line.assign(kind->logPrefix);
-    if (now) appendDescription(line, *now);
-    standardOutput(line);
+    if (logging) {
+        std::string& line = self.arrivalLine_;
+        line.assign(kind->logPrefix);
+        if (now) appendDescription(line, *now);
+        standardOutput(line);
+    }
     return true;
 }
 

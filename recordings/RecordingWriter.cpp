@@ -138,7 +138,7 @@ struct RecordingWriter::State {
             }
         }
         if (sayDropped) {
-            systemLog(
+            systemFault(
                 format("recording %s: the writer cannot keep up; events are dropped while "
                        "its queue is full (counted when the recording closes)",
                        options.path.c_str()));
@@ -161,7 +161,7 @@ struct RecordingWriter::State {
             recorded = counts.recorded;
         }
         committed.notify_all();
-        systemLog(format("recording %s stopped: %s (%llu events recorded); the program goes on",
+        systemFault(format("recording %s stopped: %s (%llu events recorded); the program goes on",
                          options.path.c_str(), why.c_str(),
                          static_cast<unsigned long long>(recorded)));
     }
@@ -365,7 +365,7 @@ void RecordingWriter::close() {
     }
     state_->committed.notify_all();
     if (!counts.stopped)
-        systemLog(format("recording %s: %llu events recorded, %llu dropped",
+        systemFault(format("recording %s: %llu events recorded, %llu dropped",
                          state_->options.path.c_str(),
                          static_cast<unsigned long long>(counts.recorded),
                          static_cast<unsigned long long>(counts.dropped)));

@@ -103,8 +103,8 @@ Subcommand addScreenCommand(CLI::App& pyxonctl) {
         "  {\"key\":\"LTE C-DRX\",\"sections\":[{\"title\":null,\"rows\":[{\"text\":"
         "\"timestamp\",\"detail\":\"2017-07-14 02:40:00 GMT\"},...]}]}\n"
         "A title or text the screen leaves unset is null. Lines that are not records or that "
-        "the store\nrefuses are reported on stderr and skipped; the store's own log lines go to "
-        "stderr too.");
+        "the store\nrefuses are reported on stderr and skipped; with -v the store's own log lines "
+        "go to stderr too.");
     return Subcommand{screen, [request] {
                           standardOutputSink().redirect(stderr);
                           return runScreen(*request, std::cin, std::cout, std::cerr);

@@ -26,7 +26,7 @@ void FaultReporter::say(const std::string& topic, const std::string& line) {
     auto [it, inserted] = last_.try_emplace(topic, line);
     if (!inserted && it->second == line) return;
     it->second = line;
-    systemLog(line);
+    systemFault(line);
 }
 
 void FaultReporter::clear(const std::string& topic) {
@@ -39,12 +39,12 @@ void FaultReporter::once(const std::string& line) {
     if (said_.contains(key)) return;
     if (said_.size() == kOnceLimit) {
         full_ = true;
-        systemLog("the modem source has said " + std::to_string(kOnceLimit) +
+        systemFault("the modem source has said " + std::to_string(kOnceLimit) +
                   " different faults of what ModemManager gives; further faults not shown");
         return;
     }
     said_.insert(std::move(key));
-    systemLog(line);
+    systemFault(line);
 }
 
 }  // namespace pyx::modem

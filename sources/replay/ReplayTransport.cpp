@@ -133,7 +133,7 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
                 return true;
             });
         } catch (const recordings::RecordingError& e) {
-            systemLog(format("replay %s; the replay stops here", e.what()));
+            systemFault(format("replay %s; the replay stops here", e.what()));
             bool say = false;
             {
                 const std::lock_guard lock(mutex_);
@@ -162,12 +162,12 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
         if (say) {
             const auto count = static_cast<unsigned long long>(played);
             if (!options_.loop) {
-                systemLog(
+                systemFault(
                     format("replay %s: end of the recording after %llu events; the screens "
                            "keep the last values",
                            options_.file.c_str(), count));
             } else {
-                systemLog(
+                systemFault(
                     format("replay %s: end of the recording after %llu events; playing it "
                            "again from the start (said once)",
                            options_.file.c_str(), count));
@@ -175,7 +175,7 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
         }
         if (finished()) {
             if (options_.loop)
-                systemLog(
+                systemFault(
                     format("replay %s: the recording holds no events", options_.file.c_str()));
             if (say && options_.onEnd) options_.onEnd(false);
             return;

@@ -54,6 +54,19 @@ TEST(ListenCommand, PrintsTheAskedCountOfMetricRecordsThatReadBackAsRecords) {
     EXPECT_EQ(Json::parse(printed.front()).begin().key(), "kKeyMetricID");
 }
 
+TEST(ListenCommand, LeavesStderrEmptyUnlessVerbose) {
+    const ProgramRun quiet = shell("\"$PYXONCTL\" listen --speed 50 --count 200");
+    EXPECT_EQ(quiet.exitCode, 0);
+    EXPECT_EQ(lines(quiet.out).size(), 200U);
+    EXPECT_EQ(quiet.err, "");
+
+    const ProgramRun verbose = shell("\"$PYXONCTL\" listen --speed 50 --count 20 --verbose");
+    EXPECT_EQ(verbose.exitCode, 0);
+    EXPECT_EQ(lines(verbose.out).size(), 20U);
+    EXPECT_NE(verbose.err.find("pushing metric file\n"), std::string::npos) << verbose.err;
+    EXPECT_NE(verbose.err.find(": MetricsTrigger dict="), std::string::npos) << verbose.err;
+}
+
 TEST(ListenCommand, AnswerToTheStartUpSimQueryIsAmongTheFirstRecords) {
     const ProgramRun run = shell("\"$PYXONCTL\" listen --speed 50 --count 40");
     EXPECT_EQ(run.exitCode, 0);

@@ -31,8 +31,8 @@ std::vector<Json> jsonLines(const std::string& text) {
     return lines;
 }
 
-TEST(Pyxonctl, DecodeWritesOneJsonLinePerRecordAndTheStoreLinesToStderr) {
-    const ProgramRun run = pyxonctl("decode",
+TEST(Pyxonctl, DecodeWritesOneJsonLinePerRecordAndWithVerboseTheStoreLinesToStderr) {
+    const ProgramRun run = pyxonctl("decode -v",
                                     "{\"kKeyMetricID\": 3986178, \"kKeyPayload\": "
                                     "\"08fbb0def7d32b12040814101e\", \"kKeyProfileID\": 1}\n"
                                     "{\"kKeyMetricID\": 3986177, \"kKeyPayload\": \"\"}\n"
@@ -58,6 +58,22 @@ TEST(Pyxonctl, DecodeWritesOneJsonLinePerRecordAndTheStoreLinesToStderr) {
     EXPECT_NE(run.err.find("I dont care for this Metric\n"), std::string::npos);
     EXPECT_NE(run.err.find("Received Valid Metric\n"), std::string::npos);
     EXPECT_EQ(run.out.find("Metric ID in Hex"), std::string::npos);
+}
+
+TEST(Pyxonctl, DecodeWithoutVerboseLeavesStderrToProblems) {
+    const std::string input =
+        "{\"kKeyMetricID\": 3986178, \"kKeyPayload\": \"08fbb0def7d32b12040814101e\"}\n";
+    const ProgramRun quiet = pyxonctl("decode", input);
+    const ProgramRun verbose = pyxonctl("-v decode", input);
+    EXPECT_EQ(quiet.exitCode, 0);
+    EXPECT_EQ(quiet.err, "");
+    EXPECT_EQ(quiet.out, verbose.out);
+    EXPECT_NE(verbose.err.find("Metric ID in Hex = 3CD302\n"), std::string::npos) << verbose.err;
+}
+
+TEST(Pyxonctl, HelpNamesTheVerboseOption) {
+    const ProgramRun run = pyxonctl("--help", "");
+    EXPECT_NE(run.out.find("-v,--verbose"), std::string::npos) << run.out;
 }
 
 TEST(Pyxonctl, DecodeOfEmptyInputWritesNothingAndSucceeds) {

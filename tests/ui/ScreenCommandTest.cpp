@@ -141,14 +141,18 @@ ProgramRun runProgram(const std::string& arguments, const std::string& input) {
 }
 
 TEST(ScreenCommandProgram, DictionaryCategory) {
-    const ProgramRun run = runProgram("LTE C-DRX", cdrxLine() + "\n");
+    const ProgramRun run = runProgram("-v LTE C-DRX", cdrxLine() + "\n");
     EXPECT_EQ(run.status, 0);
     EXPECT_EQ(run.out,
               R"({"key":"LTE C-DRX","sections":[{"title":null,"rows":[{"text":"timestamp",)"
               R"("detail":"2017-07-14 02:40:00 GMT"},{"text":"on_duration_ms","detail":"10"}]}]})"
               "\n");
-    // The store's own lines went to stderr.
+    // With -v the store's own lines went to stderr.
     EXPECT_NE(run.err.find("Received Valid Metric"), std::string::npos);
+    // Without, stderr stays empty.
+    const ProgramRun quiet = runProgram("LTE C-DRX", cdrxLine() + "\n");
+    EXPECT_EQ(quiet.out, run.out);
+    EXPECT_EQ(quiet.err, "");
 }
 
 TEST(ScreenCommandProgram, ListCategory) {
@@ -167,8 +171,8 @@ TEST(ScreenCommandProgram, UnknownKey) {
                        "\n");
 }
 
-TEST(ScreenCommandProgram, AbsentLteServingCellInfoPrintsItsLineOnStderr) {
-    const ProgramRun run = runProgram("LTE 'Serving Cell Info'", "");
+TEST(ScreenCommandProgram, AbsentLteServingCellInfoPrintsItsLineOnStderrWithVerbose) {
+    const ProgramRun run = runProgram("LTE 'Serving Cell Info' --verbose", "");
     EXPECT_EQ(run.status, 0);
     EXPECT_NE(run.err.find("You are screwed\n"), std::string::npos);
     EXPECT_EQ(run.out.find("screwed"), std::string::npos);

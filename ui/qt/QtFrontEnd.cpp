@@ -70,12 +70,12 @@ int runWindow(int& argc, char** argv, const WindowOptions& options,
     engine.setInitialProperties({{QStringLiteral("navigator"), QVariant::fromValue(&navigator)}});
     engine.load(QUrl(QStringLiteral("qrc:/pyxon/Main.qml")));
     if (engine.rootObjects().isEmpty()) {
-        systemLog("pyxon: the window could not be loaded");
+        systemFault("pyxon: the window could not be loaded");
         return 1;
     }
     auto* const window = qobject_cast<QQuickWindow*>(engine.rootObjects().constFirst());
     if (window == nullptr) {
-        systemLog("pyxon: the window's root is not a window");
+        systemFault("pyxon: the window's root is not a window");
         return 1;
     }
 
@@ -83,7 +83,7 @@ int runWindow(int& argc, char** argv, const WindowOptions& options,
     if (options.screenshotDir) {
         const QDir folder(QString::fromStdString(*options.screenshotDir));
         if (!folder.mkpath(QStringLiteral("."))) {
-            systemLog("pyxon: cannot create the screenshot folder " + *options.screenshotDir);
+            systemFault("pyxon: cannot create the screenshot folder " + *options.screenshotDir);
             return 1;
         }
         screenshots = std::make_unique<qt::Screenshots>(navigator, *window, folder,
@@ -99,7 +99,7 @@ int runWindow(int& argc, char** argv, const WindowOptions& options,
         QTimer::singleShot(0, &navigator, [&navigator, path] {
             navigator.setAnimated(false);
             if (!navigator.open(path) || !navigator.openChart())
-                systemLog("pyxon: cannot open the chart of " + path.join(" / ").toStdString());
+                systemFault("pyxon: cannot open the chart of " + path.join(" / ").toStdString());
             navigator.setAnimated(true);
         });
     }

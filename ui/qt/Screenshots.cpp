@@ -83,7 +83,7 @@ void Screenshots::next() {
         return;
     }
     if (!navigator_.open(paths_[done_])) {
-        systemLog("pyxon: cannot open the screen " + paths_[done_].join(" / ").toStdString());
+        systemFault("pyxon: cannot open the screen " + paths_[done_].join(" / ").toStdString());
         emit finished(1);
         return;
     }
@@ -97,7 +97,7 @@ void Screenshots::nextChart() {
     }
     const QStringList& path = paths_[charts_[chartsDone_]];
     if (!navigator_.open(path) || !navigator_.openChart()) {
-        systemLog("pyxon: cannot open the chart of " + path.join(" / ").toStdString());
+        systemFault("pyxon: cannot open the chart of " + path.join(" / ").toStdString());
         emit finished(1);
         return;
     }
@@ -121,7 +121,7 @@ void Screenshots::shoot() {
 bool Screenshots::save(const QString& file) {
     const QImage image = window_.grabWindow();
     if (image.isNull() || !image.save(file, "PNG")) {
-        systemLog("pyxon: cannot write the screenshot " + file.toStdString());
+        systemFault("pyxon: cannot write the screenshot " + file.toStdString());
         emit finished(1);
         return false;
     }
