@@ -27,17 +27,25 @@ void SourceArgs::addTo(CLI::App& app) {
             ->type_name("FILE");
     app.add_flag("--append", append, "With --record: add a new session to an existing recording")
         ->needs(recordOption);
+    app.add_option("--gps", gps,
+                   "Positions from gpsd, at HOST:PORT or, alone, at 127.0.0.1:2947; kept in the "
+                   "recording beside the events (e.g. --gps, --gps 192.168.1.5:2947)")
+        ->type_name("[HOST:PORT]")
+        ->expected(0, 1)
+        ->default_str("");
 }
 
 ProgramSource::ProgramSource(std::shared_ptr<velk::client::Transport> transport,
-                             std::shared_ptr<recordings::RecordingWriter> recording)
-    : transport_(std::move(transport)), recording_(std::move(recording)) {}
+                             std::shared_ptr<recordings::RecordingWriter> recording,
+                             std::unique_ptr<gps::GpsdClient> gps)
+    : transport_(std::move(transport)), recording_(std::move(recording)), gps_(std::move(gps)) {}
 
 ProgramSource::~ProgramSource() {
     close();
 }
 
 void ProgramSource::close() {
+    gps_.reset();
     if (transport_) transport_->stopEvents();
     if (recording_) recording_->close();
     transport_.reset();
@@ -45,7 +53,16 @@ void ProgramSource::close() {
 }
 
 ProgramSource openProgramSource(const SourceArgs& args, const std::string& programVersion,
-                                std::function<void(bool damaged)> onEnd) {
+                                std::function<void(bool damaged)> onEnd,
+                                std::function<void(const gps::Fix&)> onFix) {
+    std::optional<gps::GpsdAddress> gpsd;
+    if (args.gps) {
+        try {
+            gpsd = gps::parseGpsdAddress(*args.gps);
+        } catch (const gps::GpsdAddressError& e) {
+            throw sources::SourceError(e.what());
+        }
+    }
     sources::SourceOptions options;
     options.choice = sources::parseSource(args.source);
     options.seed = args.seed;
@@ -62,7 +79,17 @@ ProgramSource openProgramSource(const SourceArgs& args, const std::string& progr
         recording = std::move(recorded.writer);
     }
     velk::client::SetTransportFactory([transport] { return transport; });
-    return ProgramSource(std::move(transport), std::move(recording));
+    std::unique_ptr<gps::GpsdClient> gps;
+    if (gpsd) {
+        gps::GpsdClient::Options gpsOptions;
+        gpsOptions.address = *gpsd;
+        gpsOptions.onFix = [recording, onFix = std::move(onFix)](const gps::Fix& fix) {
+            if (recording) recording->addFix(fix);
+            if (onFix) onFix(fix);
+        };
+        gps = std::make_unique<gps::GpsdClient>(std::move(gpsOptions));
+    }
+    return ProgramSource(std::move(transport), std::move(recording), std::move(gps));
 }
 
 }  // namespace pyx

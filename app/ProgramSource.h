@@ -11,6 +11,7 @@
 #include <optional>
 #include <string>
 
+#include "gps/GpsdClient.h"
 #include "sources/Source.h"
 
 namespace CLI {
@@ -28,8 +29,10 @@ struct SourceArgs {
     bool loop = false;
     std::optional<std::string> record;
     bool append = false;
+    // --gps [HOST:PORT]: positions from gpsd ("" = gpsd's default address).
+    std::optional<std::string> gps;
 
-    // Adds --source, --seed, --speed, --loop, --record and --append to app.
+    // Adds --source, --seed, --speed, --loop, --record, --append and --gps to app.
     void addTo(CLI::App& app);
 };
 
@@ -42,30 +45,37 @@ class ProgramSource {
     // As close(): an early exit (an exception) ends the source too.
     ~ProgramSource();
 
-    // Stops the source's events, then writes what is still queued for the recording and closes
-    // it. Safe to call more than once.
+    // Stops the positions and the source's events, then writes what is still queued for the
+    // recording and closes it. Safe to call more than once.
     void close();
 
     [[nodiscard]] const std::shared_ptr<velk::client::Transport>& transport() const {
         return transport_;
     }
+    // The gpsd client of --gps; null without.
+    [[nodiscard]] const gps::GpsdClient* gps() const { return gps_.get(); }
 
   private:
     friend ProgramSource openProgramSource(const SourceArgs& args,
                                            const std::string& programVersion,
-                                           std::function<void(bool damaged)> onEnd);
+                                           std::function<void(bool damaged)> onEnd,
+                                           std::function<void(const gps::Fix&)> onFix);
     ProgramSource(std::shared_ptr<velk::client::Transport> transport,
-                  std::shared_ptr<recordings::RecordingWriter> recording);
+                  std::shared_ptr<recordings::RecordingWriter> recording,
+                  std::unique_ptr<gps::GpsdClient> gps);
 
     std::shared_ptr<velk::client::Transport> transport_;
     std::shared_ptr<recordings::RecordingWriter> recording_;  // for --record
+    std::unique_ptr<gps::GpsdClient> gps_;                    // for --gps
 };
 
-// Opens the source args name and sets it as velk's transport factory. onEnd: called when a
-// replay without --loop reaches the end of its recording (see SourceOptions::onEnd). Throws
-// sources::SourceError with one line saying what is wrong.
+// Opens the source args name and sets it as velk's transport factory; with --gps, starts the
+// gpsd client, whose fixes go to the recording (with --record) and to onFix (on the client's
+// thread). onEnd: called when a replay without --loop reaches the end of its recording (see
+// SourceOptions::onEnd). Throws sources::SourceError with one line saying what is wrong.
 [[nodiscard]] ProgramSource openProgramSource(const SourceArgs& args,
                                               const std::string& programVersion,
-                                              std::function<void(bool damaged)> onEnd = {});
+                                              std::function<void(bool damaged)> onEnd = {},
+                                              std::function<void(const gps::Fix&)> onFix = {});
 
 }  // namespace pyx

@@ -5,8 +5,10 @@
 //   meta(key, value)       format_version, created_ns, program: about the whole file
 //   sessions(...)          one row per recording run (a new one for each --append)
 //   events(...)            one row per event, in arrival order (id ascending)
+//   positions(...)         one row per GPS fix of a run with --gps (format 2 on)
 //
 // A reader refuses a format version above its own; a later writer keeps reading older ones.
+// Format 1 has no positions; a session appended to it adds the table and makes it format 2.
 #pragma once
 
 #include <cstdint>
@@ -14,7 +16,7 @@
 namespace pyx::recordings {
 
 inline constexpr std::int32_t kApplicationID = 0x50595852;  // "PYXR"
-inline constexpr std::int32_t kFormatVersion = 1;
+inline constexpr std::int32_t kFormatVersion = 2;
 
 inline constexpr char kSchema[] =
     "CREATE TABLE meta(key TEXT PRIMARY KEY, value);"
@@ -35,5 +37,22 @@ inline constexpr char kSchema[] =
     "  metric_id INTEGER,"         // kKeyMetricID when an integer
     "  payload BLOB,"              // kKeyPayload when bytes
     "  record BLOB NOT NULL);";    // the rest of the event object (RecordCodec)
+
+// Format 2: the positions. A new file gets them beside kSchema; a format-1 file gets them when a
+// session is appended.
+inline constexpr std::int32_t kFirstFormatWithPositions = 2;
+inline constexpr char kPositionsSchema[] =
+    "CREATE TABLE IF NOT EXISTS positions("
+    "  id INTEGER PRIMARY KEY,"  // arrival order
+    "  session INTEGER NOT NULL,"
+    "  time_ns INTEGER NOT NULL,"      // the fix's own time (UTC), ns since 1970
+    "  received_ns INTEGER NOT NULL,"  // wall clock at arrival, ns since 1970
+    "  mode INTEGER NOT NULL,"         // gpsd's mode: 2 = 2D, 3 = 3D
+    "  lat REAL NOT NULL,"             // degrees, WGS 84
+    "  lon REAL NOT NULL,"
+    "  alt_m REAL,"  // metres above mean sea level
+    "  speed_mps REAL,"
+    "  track_deg REAL,"  // degrees from true north
+    "  horizontal_error_m REAL);";
 
 }  // namespace pyx::recordings

@@ -99,11 +99,64 @@ RecordingReader::Summary RecordingReader::summary() const {
             session.host = sessions.text(6);
             summary.sessions.push_back(std::move(session));
         }
+        if (hasPositions()) {
+            SqliteStatement box = db_->prepare(
+                "SELECT count(*), min(time_ns), max(time_ns), min(lat), min(lon), max(lat), "
+                "max(lon) FROM positions");
+            if (box.step() && box.integer(0) > 0)
+                summary.positions = Summary::Positions{static_cast<std::uint64_t>(box.integer(0)),
+                                                       box.integer(1),
+                                                       box.integer(2),
+                                                       box.real(3),
+                                                       box.real(4),
+                                                       box.real(5),
+                                                       box.real(6)};
+        }
     } catch (const SqliteError& e) {
         throw RecordingError(RecordingError::Kind::Damaged, path_,
                              std::string("damaged: ") + e.what());
     }
     return summary;
+}
+
+bool RecordingReader::hasPositions() const {
+    return db_->queryInteger(
+               "SELECT count(*) FROM sqlite_master WHERE type='table' AND name='positions'") > 0;
+}
+
+std::uint64_t RecordingReader::forEachPosition(
+    const std::function<bool(const gps::Fix& fix)>& visit) const {
+    std::uint64_t handed = 0;
+    try {
+        if (!hasPositions()) return 0;
+        SqliteStatement rows = db_->prepare(
+            "SELECT time_ns, received_ns, mode, lat, lon, alt_m, speed_mps, track_deg, "
+            "horizontal_error_m FROM positions ORDER BY received_ns, id");
+        const auto optional = [&rows](int column) {
+            return rows.isNull(column) ? std::nullopt : std::optional(rows.real(column));
+        };
+        while (rows.step()) {
+            gps::Fix fix;
+            fix.timeNs = rows.integer(0);
+            fix.receivedNs = rows.integer(1);
+            const std::int64_t mode = rows.integer(2);
+            fix.mode =
+                mode >= 0 && mode <= 3 ? static_cast<gps::FixMode>(mode) : gps::FixMode::Unknown;
+            fix.lat = rows.real(3);
+            fix.lon = rows.real(4);
+            fix.altM = optional(5);
+            fix.speedMps = optional(6);
+            fix.trackDeg = optional(7);
+            fix.horizontalErrorM = optional(8);
+            ++handed;
+            if (!visit(fix)) break;
+        }
+    } catch (const SqliteError& e) {
+        throw RecordingError(RecordingError::Kind::Damaged, path_,
+                             format("damaged after %llu positions: %s",
+                                    static_cast<unsigned long long>(handed), e.what()));
+    }
+    return handed;
 }
 
 std::uint64_t RecordingReader::forEach(

@@ -14,6 +14,7 @@
 #include <string>
 #include <vector>
 
+#include "gps/Fix.h"
 #include "recordings/RecordedEvent.h"
 #include "recordings/RecordingSession.h"
 
@@ -40,6 +41,14 @@ class RecordingReader {
         std::map<std::int64_t, std::uint64_t> kinds;
         std::int32_t formatVersion = 0;
         std::vector<RecordingSession> sessions;
+        // The GPS fixes (--gps): how many, their own times' span, and the box they lie in.
+        struct Positions {
+            std::uint64_t count = 0;
+            std::int64_t firstNs = 0;
+            std::int64_t lastNs = 0;
+            double south = 0, west = 0, north = 0, east = 0;  // degrees
+        };
+        std::optional<Positions> positions;  // none in the file (or a format-1 file)
     };
 
     // Opens and checks path; throws RecordingError.
@@ -57,7 +66,14 @@ class RecordingReader {
     std::uint64_t forEach(const Filter& filter,
                           const std::function<bool(RecordedEvent& event)>& visit) const;
 
+    // Calls visit with each GPS fix in the order they arrived (their wall-clock arrival time
+    // then their order in the file) until visit returns false; returns how many were handed
+    // out. A file without positions hands out none. Throws RecordingError (Damaged).
+    std::uint64_t forEachPosition(const std::function<bool(const gps::Fix& fix)>& visit) const;
+
   private:
+    [[nodiscard]] bool hasPositions() const;
+
     std::string path_;
     std::unique_ptr<SqliteDatabase> db_;
     std::int32_t formatVersion_ = 0;

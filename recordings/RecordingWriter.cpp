@@ -41,11 +41,13 @@ std::int64_t monoNow() {
         .count();
 }
 
+// An event, or a GPS fix (fix set, the rest empty): both keep their order on one queue.
 struct Pending {
     std::string stream;
     std::int64_t wallNs;
     std::int64_t monoNs;
     Value object;
+    std::optional<gps::Fix> fix;
 };
 
 // What a failed write means to the user, in a few words. SQLite reports a failed write as an
@@ -118,7 +120,12 @@ struct RecordingWriter::State {
     std::thread thread;
 
     void add(std::string_view stream, Value&& object) {
-        Pending pending{std::string(stream), wallNow(), monoNow(), std::move(object)};
+        enqueue(Pending{std::string(stream), wallNow(), monoNow(), std::move(object), {}});
+    }
+
+    void addFix(const gps::Fix& fix) { enqueue(Pending{{}, 0, 0, Value(), fix}); }
+
+    void enqueue(Pending&& pending) {
         bool sayDropped = false;
         {
             const std::lock_guard lock(mutex);
@@ -162,8 +169,8 @@ struct RecordingWriter::State {
         }
         committed.notify_all();
         systemFault(format("recording %s stopped: %s (%llu events recorded); the program goes on",
-                         options.path.c_str(), why.c_str(),
-                         static_cast<unsigned long long>(recorded)));
+                           options.path.c_str(), why.c_str(),
+                           static_cast<unsigned long long>(recorded)));
     }
 
     SqliteDatabase open(std::int64_t& sessionID, FileIdentity& identity) {
@@ -177,6 +184,7 @@ struct RecordingWriter::State {
             db.execute(format("PRAGMA application_id=%d; PRAGMA user_version=%d;", kApplicationID,
                               kFormatVersion));
             db.execute(kSchema);
+            db.execute(kPositionsSchema);
             SqliteStatement meta = db.prepare("INSERT INTO meta(key, value) VALUES(?, ?)");
             meta.bind(1, std::string_view("format_version"));
             meta.bind(2, static_cast<std::int64_t>(kFormatVersion));
@@ -189,6 +197,14 @@ struct RecordingWriter::State {
             meta.bind(1, std::string_view("program"));
             meta.bind(2, std::string_view("pyxon"));
             meta.step();
+            db.execute("COMMIT");
+        } else if (db.queryInteger("PRAGMA user_version") < kFirstFormatWithPositions) {
+            // An older recording gains the positions table as this session is added to it.
+            db.execute("BEGIN");
+            db.execute(kPositionsSchema);
+            db.execute(format("PRAGMA user_version=%d;", kFirstFormatWithPositions));
+            db.execute(format("UPDATE meta SET value=%d WHERE key='format_version';",
+                              kFirstFormatWithPositions));
             db.execute("COMMIT");
         }
         const RecordingSession& s = options.session;
@@ -214,16 +230,22 @@ struct RecordingWriter::State {
         FileIdentity identity;
         std::optional<SqliteDatabase> db;
         std::optional<SqliteStatement> prepared;
+        std::optional<SqliteStatement> preparedFix;
         try {
             db.emplace(open(sessionID, identity));
             prepared.emplace(db->prepare(
                 "INSERT INTO events(session, stream, wall_ns, mono_ns, metric_id, payload, "
                 "record) VALUES(?, ?, ?, ?, ?, ?, ?)"));
+            preparedFix.emplace(db->prepare(
+                "INSERT INTO positions(session, time_ns, received_ns, mode, lat, lon, alt_m, "
+                "speed_mps, track_deg, horizontal_error_m) VALUES(?, ?, ?, ?, ?, ?, ?, ?, ?, ?)"));
         } catch (const SqliteError& error) {
             stop("cannot open it: " + whyWriteFailed(error, options.path));
             return;
         }
         SqliteStatement& insert = *prepared;
+        SqliteStatement& insertFix = *preparedFix;
+        std::uint64_t inTransactionFixes = 0;
         EncodedRecord encoded;
         std::deque<Pending> batch;
         bool inTransaction = false;
@@ -254,6 +276,24 @@ struct RecordingWriter::State {
                         db->execute("BEGIN");
                         inTransaction = true;
                         transactionStart = Clock::now();
+                    }
+                    if (event.fix) {
+                        const gps::Fix& f = *event.fix;
+                        insertFix.bind(1, sessionID);
+                        insertFix.bind(2, f.timeNs);
+                        insertFix.bind(3, f.receivedNs);
+                        insertFix.bind(4, static_cast<std::int64_t>(f.mode));
+                        insertFix.bind(5, f.lat);
+                        insertFix.bind(6, f.lon);
+                        insertFix.bindOrNull(7, f.altM);
+                        insertFix.bindOrNull(8, f.speedMps);
+                        insertFix.bindOrNull(9, f.trackDeg);
+                        insertFix.bindOrNull(10, f.horizontalErrorM);
+                        insertFix.step();
+                        insertFix.reset();
+                        ++inTransactionFixes;
+                        ++written;
+                        continue;
                     }
                     encodeRecord(event.object, encoded);
                     insert.bind(1, sessionID);
@@ -288,8 +328,10 @@ struct RecordingWriter::State {
                     {
                         const std::lock_guard lock(mutex);
                         counts.recorded += inTransactionCount;
+                        counts.positions += inTransactionFixes;
                     }
                     inTransactionCount = 0;
+                    inTransactionFixes = 0;
                 }
                 if (!inTransaction) {
                     {
@@ -339,6 +381,10 @@ void RecordingWriter::add(std::string_view stream, Value&& object) {
     state_->add(stream, std::move(object));
 }
 
+void RecordingWriter::addFix(const gps::Fix& fix) {
+    state_->addFix(fix);
+}
+
 void RecordingWriter::flush() {
     std::unique_lock lock(state_->mutex);
     const std::uint64_t target = state_->queuedSeq;
@@ -365,10 +411,14 @@ void RecordingWriter::close() {
     }
     state_->committed.notify_all();
     if (!counts.stopped)
-        systemFault(format("recording %s: %llu events recorded, %llu dropped",
-                         state_->options.path.c_str(),
-                         static_cast<unsigned long long>(counts.recorded),
-                         static_cast<unsigned long long>(counts.dropped)));
+        systemFault(format(
+            "recording %s: %llu events recorded, %llu dropped%s", state_->options.path.c_str(),
+            static_cast<unsigned long long>(counts.recorded),
+            static_cast<unsigned long long>(counts.dropped),
+            counts.positions > 0
+                ? format(", %llu positions", static_cast<unsigned long long>(counts.positions))
+                      .c_str()
+                : ""));
 }
 
 RecordingWriter::Counts RecordingWriter::counts() const {

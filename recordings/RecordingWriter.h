@@ -18,6 +18,7 @@
 #include <string_view>
 
 #include "core/Value.h"
+#include "gps/Fix.h"
 #include "recordings/RecordingSession.h"
 
 namespace pyx::recordings {
@@ -35,9 +36,10 @@ class RecordingWriter {
     };
 
     struct Counts {
-        std::uint64_t recorded = 0;  // committed to the file
-        std::uint64_t dropped = 0;   // lost to a full queue or after a write failed
-        bool stopped = false;        // a write failed: nothing more is written
+        std::uint64_t recorded = 0;   // committed to the file
+        std::uint64_t dropped = 0;    // lost to a full queue or after a write failed
+        bool stopped = false;         // a write failed: nothing more is written
+        std::uint64_t positions = 0;  // GPS fixes committed to the file
     };
 
     // Refuses an existing file without append, and a path that is a directory, with a
@@ -52,6 +54,9 @@ class RecordingWriter {
     // One event as it arrives; safe from any thread.
     void add(std::string_view stream, const Value& object);
     void add(std::string_view stream, Value&& object);
+    // One GPS fix, kept in the positions table in the order it came among the events; safe
+    // from any thread. A full queue drops it as it would an event.
+    void addFix(const gps::Fix& fix);
     // Blocks until every event added before the call is committed (or the recording stopped).
     void flush();
     // Commits what is queued, closes the file and says how many events it holds; add() is

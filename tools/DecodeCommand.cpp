@@ -108,7 +108,8 @@ Subcommand addDecodeCommand(CLI::App& pyxonctl) {
         "decode says why and at which byte, e.g. for the payload \"08ff\"\n"
         "  {\"metric\":\"0x3CD302\",\"error\":\"does not decode as "
         "KCellularLteTxPower: truncated varint at byte 1\"}\n"
-        "With -v the store's own log lines go to stderr. The exit code is 0 once all input is read.\n");
+        "With -v the store's own log lines go to stderr. The exit code is 0 once all input is "
+        "read.\n");
     return Subcommand{decode, [] {
                           standardOutputSink().redirect(stderr);
                           return runDecode(std::cin, std::cout);

@@ -2,6 +2,7 @@
 
 #include <CLI/CLI.hpp>
 
+#include <array>
 #include <charconv>
 #include <iostream>
 #include <memory>
@@ -17,8 +18,11 @@
 #include "recordings/RecordingReader.h"
 #include "tools/CsvText.h"
 #include "tools/DecodeCommand.h"
+#include "tools/FlatFields.h"
 #include "tools/IsoTime.h"
+#include "tools/MapExport.h"
 #include "tools/MetricIDText.h"
+#include "tools/PositionJoin.h"
 #include "tools/RecordWriter.h"
 
 namespace pyx {
@@ -49,59 +53,6 @@ class QuietStore {
     QuietStore(const QuietStore&) = delete;
     QuietStore& operator=(const QuietStore&) = delete;
 };
-
-using Scalar = std::function<void(const std::string&, const Value&)>;
-
-void flatten(const Value& value, std::string& path, const Scalar& scalar);
-
-// One text per scalar field of a dictionary, named by its path.
-void flatten(const Dict& dict, std::string& path, const Scalar& scalar) {
-    const std::size_t mark = path.size();
-    for (const auto& entry : dict) {
-        if (mark > 0) path += '.';
-        path += entry.key;
-        flatten(entry.value, path, scalar);
-        path.resize(mark);
-    }
-}
-
-void flatten(const Value& value, std::string& path, const Scalar& scalar) {
-    const std::size_t mark = path.size();
-    if (value.isDict()) {
-        flatten(value.asDict(), path, scalar);
-    } else if (value.isArray()) {
-        const Array& items = value.asArray();
-        for (std::size_t i = 0; i < items.size(); ++i) {
-            if (mark > 0) path += '.';
-            path += std::to_string(i);
-            flatten(items[i], path, scalar);
-            path.resize(mark);
-        }
-    } else {
-        scalar(path, value);
-    }
-}
-
-std::string cellText(const Value& value) {
-    switch (value.kind()) {
-        case Value::Kind::Null:
-            return {};
-        case Value::Kind::Bool:
-            return value.asBool() ? "true" : "false";
-        case Value::Kind::Int:
-            return std::to_string(value.asInt());
-        case Value::Kind::UInt:
-            return std::to_string(value.asUInt());
-        case Value::Kind::Float:
-            return formatFloat(value.asFloat());
-        case Value::Kind::String:
-            return value.asString();
-        case Value::Kind::Data:
-            return hexString(value.asBytes());
-        default:
-            return value.description();
-    }
-}
 
 // The event's record; its object is taken, not copied.
 MetricRecord recordOf(RecordedEvent& event) {
@@ -147,11 +98,60 @@ Written writeEvents(const RecordingReader& reader, const RecordingReader::Filter
     return Written{status, exported};
 }
 
+// The position columns of csv, and the keys of jsonl's "gps" object, in this order.
+constexpr std::array<std::string_view, 7> kPositionColumns = {"gps_lat",
+                                                              "gps_lon",
+                                                              "gps_alt_m",
+                                                              "gps_speed_mps",
+                                                              "gps_track_deg",
+                                                              "gps_fix",
+                                                              "gps_horizontal_error_m"};
+
+std::array<std::string, 7> positionCells(const gps::Fix* fix) {
+    if (fix == nullptr) return {};
+    const auto optional = [](const std::optional<double>& v) {
+        return v ? format("%.3f", *v) : std::string();
+    };
+    return {format("%.7f", fix->lat),
+            format("%.7f", fix->lon),
+            optional(fix->altM),
+            optional(fix->speedMps),
+            optional(fix->trackDeg),
+            fix->mode == gps::FixMode::ThreeD ? "3D" : "2D",
+            optional(fix->horizontalErrorM)};
+}
+
+void appendPosition(std::string& out, const gps::Fix* fix) {
+    out.pop_back();  // the closing brace
+    if (fix == nullptr) {
+        out += R"(, "gps": null})";
+        return;
+    }
+    const auto cells = positionCells(fix);
+    out += R"(, "gps": {)";
+    bool first = true;
+    for (std::size_t i = 0; i < cells.size(); ++i) {
+        if (cells[i].empty()) continue;
+        out += first ? "\"" : ", \"";
+        out += kPositionColumns[i].substr(4);
+        out += "\": ";
+        const bool text = kPositionColumns[i] == "gps_fix";
+        if (text) out += '"';
+        out += cells[i];
+        if (text) out += '"';
+        first = false;
+    }
+    out += "}}";
+}
+
 int exportJsonl(const RecordingReader& reader, const RecordingReader::Filter& filter,
                 std::ostream& out, std::ostream& err) {
+    const PositionJoin positions(reader);
     return writeEvents(reader, filter, {}, out, err,
-                       [](std::string& buffer, RecordedEvent& event) {
+                       [&positions](std::string& buffer, RecordedEvent& event) {
                            appendExportLine(buffer, event);
+                           if (!positions.empty())
+                               appendPosition(buffer, positions.at(event.wallNs));
                            buffer += '\n';
                        })
         .status;
@@ -160,6 +160,7 @@ int exportJsonl(const RecordingReader& reader, const RecordingReader::Filter& fi
 int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filter,
               std::ostream& out, std::ostream& err) {
     const QuietStore quiet;
+    const PositionJoin positions(reader);
     // First pass: the columns, in the order first seen.
     std::vector<std::string> columns{"time", "metric", "property"};
     std::unordered_map<std::string, std::size_t> columnIndex;
@@ -181,6 +182,11 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
             // The second pass stops at the same place and says so.
         }
     }
+
+    // The position columns come last, when the recording has positions.
+    const std::size_t positionAt = columns.size();
+    if (!positions.empty())
+        for (const std::string_view name : kPositionColumns) columns.emplace_back(name);
 
     // Second pass: the rows.
     std::string header;
@@ -209,6 +215,11 @@ int exportCsv(const RecordingReader& reader, const RecordingReader::Filter& filt
                 const auto at = columnIndex.find(name);
                 if (at != columnIndex.end()) cells[at->second] = cellText(v);
             });
+            if (!positions.empty()) {
+                auto place = positionCells(positions.at(event.wallNs));
+                for (std::size_t i = 0; i < place.size(); ++i)
+                    cells[positionAt + i] = std::move(place[i]);
+            }
             appendCsvRow(buffer, cells);
         });
     if (refused > 0)
@@ -258,8 +269,10 @@ int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err
     };
     if (!time(request.from, "--from", filter.fromNs) || !time(request.to, "--to", filter.toNs))
         return 2;
-    if (request.format != "jsonl" && request.format != "csv") {
-        err << "pyxonctl export: --format '" << request.format << "': expected jsonl or csv\n";
+    if (request.format != "jsonl" && request.format != "csv" && request.format != "geojson" &&
+        request.format != "kml") {
+        err << "pyxonctl export: --format '" << request.format
+            << "': expected jsonl, csv, geojson or kml\n";
         return 2;
     }
     std::optional<RecordingReader> reader;
@@ -269,8 +282,21 @@ int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err
         err << "pyxonctl export: " << e.what() << '\n';
         return 1;
     }
-    const int status = request.format == "csv" ? exportCsv(*reader, filter, out, err)
-                                               : exportJsonl(*reader, filter, out, err);
+    int status = 0;
+    try {
+        if (request.format == "csv")
+            status = exportCsv(*reader, filter, out, err);
+        else if (request.format == "geojson")
+            status = exportGeoJson(*reader, filter, request.file, out, err);
+        else if (request.format == "kml")
+            status = exportKml(*reader, filter, request.file, out, err);
+        else
+            status = exportJsonl(*reader, filter, out, err);
+    } catch (const RecordingError& e) {
+        // The positions could not be read.
+        err << "pyxonctl export: " << e.what() << '\n';
+        return 1;
+    }
     // A full disk or a closed pipe: what was asked for did not all get out.
     if (!out) {
         err << "pyxonctl export: writing the output failed\n";
@@ -281,11 +307,12 @@ int runExport(const ExportRequest& request, std::ostream& out, std::ostream& err
 
 Subcommand addExportCommand(CLI::App& pyxonctl) {
     CLI::App* command = pyxonctl.add_subcommand(
-        "export", "Write the metric events of a recording (.pyxrec) as JSON Lines or CSV");
+        "export",
+        "Write the metric events of a recording (.pyxrec) as JSON Lines, CSV, GeoJSON or KML");
     auto request = std::make_shared<ExportRequest>();
     command->add_option("FILE", request->file, "The recording, made with --record")->required();
-    command->add_option("--format", request->format, "jsonl or csv")
-        ->check(CLI::IsMember({"jsonl", "csv"}))
+    command->add_option("--format", request->format, "jsonl, csv, geojson or kml")
+        ->check(CLI::IsMember({"jsonl", "csv", "geojson", "kml"}))
         ->capture_default_str();
     command
         ->add_option("--kind", request->kinds,
@@ -304,6 +331,15 @@ Subcommand addExportCommand(CLI::App& pyxonctl) {
         "field of the decoded dictionary (inst_values.0.rsrp0 ...); the header holds every "
         "column\nof the kinds asked for. Records the store refuses are skipped, one stderr line "
         "each.\n"
+        "Positions (a recording made with --gps): jsonl lines end with \"gps\": {lat, lon, "
+        "alt_m,\nspeed_mps, track_deg, fix, horizontal_error_m} and csv rows with the columns "
+        "gps_lat ...\ngps_horizontal_error_m: the latest fix no older than 2 s when the event "
+        "arrived, else\nnull or empty. Without positions both are as before.\n"
+        "geojson: a FeatureCollection (RFC 7946, WGS 84) of one Point [lon, lat] per event with "
+        "a\nposition; properties: time, metric, property, the serving level then (serving_dBm, "
+        "...)\nand the event's fields as csv names them. kml: KML 2.2, a Placemark per such "
+        "event\ncoloured by the serving level (LTE RSRP, UMTS RSSI, GSM RxLev) and the track as "
+        "a line.\nBoth open in QGIS and Google Earth.\n"
         "TIME is ISO 8601, UTC unless it names a zone: 2026-11-23T19:05:50Z, 2026-11-23 "
         "19:05,\n2026-11-23T21:05:50.5+02:00. A damaged recording exports what can be read and "
         "says\nhow much that was (exit code 1).\n"
@@ -311,7 +347,9 @@ Subcommand addExportCommand(CLI::App& pyxonctl) {
         "  pyxonctl export drive.pyxrec --format jsonl | pyxonctl screen LTE \"CA Status\"\n"
         "  pyxonctl export drive.pyxrec --format csv --kind 0x3C4E04 > rrc-state.csv\n"
         "  pyxonctl export drive.pyxrec --format csv --from 2026-11-23T19:05Z --to "
-        "2026-11-23T19:10Z\n");
+        "2026-11-23T19:10Z\n"
+        "  pyxonctl export drive.pyxrec --format geojson --kind 0x3C4F6A > rsrp.geojson\n"
+        "  pyxonctl export drive.pyxrec --format kml > drive.kml\n");
     return Subcommand{command, [request] { return runExport(*request, std::cout, std::cerr); }};
 }
 

@@ -43,6 +43,16 @@ int runInfo(const std::string& file, std::ostream& out, std::ostream& err) {
             {"host", session.host},
         });
     }
+    Json positions(nullptr);
+    if (const auto& p = summary.positions) {
+        positions = Json{
+            {"fixes", p->count},
+            {"first", isoTime(p->firstNs)},
+            {"last", isoTime(p->lastNs)},
+            {"box",
+             Json{{"south", p->south}, {"west", p->west}, {"north", p->north}, {"east", p->east}}},
+        };
+    }
     const double duration = summary.firstNs && summary.lastNs
                                 ? static_cast<double>(*summary.lastNs - *summary.firstNs) / 1e9
                                 : 0.0;
@@ -55,6 +65,7 @@ int runInfo(const std::string& file, std::ostream& out, std::ostream& err) {
         {"kinds", std::move(kinds)},
         {"format_version", summary.formatVersion},
         {"sessions", std::move(sessions)},
+        {"positions", std::move(positions)},
     };
     out << info.dump(-1, ' ', false, Json::error_handler_t::replace) << '\n';
     out.flush();
@@ -72,10 +83,13 @@ Subcommand addInfoCommand(CLI::App& pyxonctl) {
         "prints\n"
         "  {\"file\":\"drive.pyxrec\",\"events\":1234,\"first\":\"2026-11-23T19:05:50.123456789Z\","
         "\"last\":\"2026-11-23T19:06:51.623456789Z\",\"duration_s\":61.5,\"kinds\":{\"0x3C4E04\""
-        ":12,...},\"format_version\":1,\"sessions\":[{\"id\":1,\"start\":\"...\","
+        ":12,...},\"format_version\":2,\"sessions\":[{\"id\":1,\"start\":\"...\","
         "\"program_version\":\"0.1.0\",\"source\":\"sim\",\"seed\":1,\"speed\":20.0,\"host\":"
-        "\"car-laptop\"}]}\n"
-        "Times are UTC. A file that is missing, not a recording, of a newer format or damaged "
+        "\"car-laptop\"}],\"positions\":{\"fixes\":61,\"first\":\"...\",\"last\":\"...\","
+        "\"box\":{\"south\":48.8566,\"west\":2.3522,\"north\":48.8605,\"east\":2.3611}}}\n"
+        "positions: the GPS fixes of runs with --gps (their own times, the box they lie in, in "
+        "degrees), null without.\nTimes are UTC. A file that is missing, not a recording, of a "
+        "newer format or damaged "
         "gives one\nline on stderr and exit code 1.\n");
     return Subcommand{info, [file] { return runInfo(*file, std::cout, std::cerr); }};
 }

@@ -52,6 +52,29 @@ const Array* listAt(const Dict& dict, std::string_view key) {
 
 }  // namespace
 
+std::optional<float> singleValue(const Quantity& q, const Dict& stored) {
+    switch (q.pick) {
+        case Pick::Field: {
+            const Dict* holder = &stored;
+            if (!q.container.empty()) {
+                const Value* nested = stored.find(q.container);
+                if (nested == nullptr || !nested->isDict()) return std::nullopt;
+                holder = &nested->asDict();
+            }
+            return numberAt(*holder, q.field, q.convertedAs);
+        }
+        case Pick::FirstEntry: {
+            const Array* list = listAt(stored, q.container);
+            if (list == nullptr || list->empty() || !list->front().isDict()) return std::nullopt;
+            return numberAt(list->front().asDict(), q.field);
+        }
+        case Pick::EachEntry:
+        case Pick::Strongest:
+            break;
+    }
+    return std::nullopt;
+}
+
 History::History() : History(Limits{}) {}
 
 History::History(Limits limits, Clock clock)
@@ -108,22 +131,9 @@ void History::record(MetricValidator::DictionaryProperty property, const Dict& s
 bool History::add(std::size_t quantity, const Dict& stored, double timeMs) {
     const Quantity& q = historyQuantities()[quantity];
     switch (q.pick) {
-        case Pick::Field: {
-            const Dict* holder = &stored;
-            if (!q.container.empty()) {
-                const Value* nested = stored.find(q.container);
-                if (nested == nullptr || !nested->isDict()) return false;
-                holder = &nested->asDict();
-            }
-            const auto value = numberAt(*holder, q.field, q.convertedAs);
-            if (!value) return false;
-            singleFor(quantity).add(timeMs, *value);
-            return true;
-        }
+        case Pick::Field:
         case Pick::FirstEntry: {
-            const Array* list = listAt(stored, q.container);
-            if (list == nullptr || list->empty() || !list->front().isDict()) return false;
-            const auto value = numberAt(list->front().asDict(), q.field);
+            const auto value = singleValue(q, stored);
             if (!value) return false;
             singleFor(quantity).add(timeMs, *value);
             return true;

@@ -3,6 +3,7 @@
 // screens show: the stored dictionaries after the store's conversions.
 #pragma once
 
+#include <optional>
 #include <span>
 #include <string_view>
 
@@ -57,6 +58,10 @@ struct Quantity {
 
 // Every quantity, grouped by chart in chart order.
 [[nodiscard]] std::span<const Quantity> historyQuantities();
+
+// The value of a quantity of one value (Field, FirstEntry) in a stored dictionary of its
+// kind, as the screens show it; nothing when it is absent (or for a per-entry quantity).
+[[nodiscard]] std::optional<float> singleValue(const Quantity& q, const Dict& stored);
 
 // How many neighbours are kept per arrival: the strongest ones.
 inline constexpr std::size_t kStrongestNeighbours = 8;

@@ -154,7 +154,7 @@ TEST(RecordingFile, TheSummaryCountsEventsAndKindsAndGivesTheFirstAndLastTime) {
     }
     const auto summary = RecordingReader(file).summary();
     EXPECT_EQ(summary.events, 31u);
-    EXPECT_EQ(summary.formatVersion, 1);
+    EXPECT_EQ(summary.formatVersion, 2);
     EXPECT_EQ(summary.kinds, (std::map<std::int64_t, std::uint64_t>{
                                  {0x3C4E01, 10}, {0x3C4E04, 10}, {0x3CD302, 10}}));
     ASSERT_TRUE(summary.firstNs && summary.lastNs);

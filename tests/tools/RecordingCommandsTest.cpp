@@ -280,7 +280,7 @@ TEST(InfoCommand, SaysHowManyEventsOfWhichKindsWhenAndFromWhichSessions) {
     EXPECT_DOUBLE_EQ(object["duration_s"].get<double>(),
                      static_cast<double>(events.back().wallNs - events.front().wallNs) / 1e9);
     EXPECT_EQ(object["kinds"], Json::parse(R"({"0x3C4E01":4,"0x3C4E04":5,"0x3CD302":4})"));
-    EXPECT_EQ(object["format_version"], 1);
+    EXPECT_EQ(object["format_version"], 2);
     ASSERT_EQ(object["sessions"].size(), 2u);
     EXPECT_EQ(object["sessions"][0]["source"], "sim");
     EXPECT_EQ(object["sessions"][0]["seed"], 5);
@@ -317,7 +317,7 @@ std::vector<std::pair<std::string, std::string>> badFiles(const TempDir& dir) {
         {dir.file("gone.pyxrec"), "no such file"},
         {dir.path().string(), "is a directory, not a recording"},
         {text, "not a Pyxon recording (not an SQLite database)"},
-        {future, "written in format version 9 by a newer Pyxon; this one reads up to version 1"}};
+        {future, "written in format version 9 by a newer Pyxon; this one reads up to version 2"}};
 }
 
 TEST(InfoCommand, EachBadFileGivesOneLineNamingItAndANonZeroExit) {
@@ -399,7 +399,7 @@ TEST(ExportCommand, ABadKindTimeOrFormatIsRefusedWithOneLine) {
     request.format = "xml";
     run = exportOf(request);
     EXPECT_EQ(run.status, 2);
-    EXPECT_EQ(run.err, "pyxonctl export: --format 'xml': expected jsonl or csv\n");
+    EXPECT_EQ(run.err, "pyxonctl export: --format 'xml': expected jsonl, csv, geojson or kml\n");
 }
 
 TEST(ExportCommand, EachBadFileGivesOneLineNamingItAndANonZeroExit) {
@@ -452,7 +452,8 @@ TEST(ExportCommand, ADamagedFileExportsWhatCanBeReadAndSaysHowMuch) {
         ASSERT_EQ(Json::parse(lines[i])["kKeyTriggerRef"], i);
     const auto errLines = linesOf(run.err);
     ASSERT_EQ(errLines.size(), 1u) << run.err;
-    EXPECT_EQ(errLines[0].rfind("pyxonctl export: " + file + ": damaged after event ", 0), 0u)
+    EXPECT_TRUE(errLines[0].starts_with("pyxonctl export: " + file + ": damaged after event ") ||
+                errLines[0].starts_with("pyxonctl export: " + file + ": damaged at event "))
         << errLines[0];
     const std::string tail =
         "; exported the " + std::to_string(lines.size()) + " events read before it";

@@ -1,0 +1,59 @@
+#include "tools/ServingLevel.h"
+
+#include "metrics/history/Quantity.h"
+
+namespace pyx {
+namespace {
+
+// The serving level of each technology, in the order they are preferred: the charts' quantity
+// it is, and the lower bounds (dBm) of the classes above "very poor", strongest first.
+struct LevelSource {
+    Chart chart;
+    std::string_view quantity;
+    std::string_view technology;
+    std::string_view label;
+    std::array<double, 4> bounds;
+};
+
+constexpr std::array kLevelSources = {
+    LevelSource{Chart::LteServing, "RSRP", "LTE", "RSRP", {-80, -90, -100, -110}},
+    LevelSource{Chart::UmtsServing, "RSSI", "UMTS", "RSSI", {-60, -70, -80, -90}},
+    LevelSource{Chart::GsmServing, "RxLev idle", "GSM", "RxLev", {-70, -80, -90, -100}},
+};
+
+const Quantity* quantityOf(const LevelSource& source) {
+    for (const Quantity& q : historyQuantities())
+        if (q.chart == source.chart && q.name == source.quantity) return &q;
+    return nullptr;
+}
+
+}  // namespace
+
+void ServingLevelTracker::update(std::string_view property, const Dict& dictionary,
+                                 std::int64_t wallNs) {
+    for (std::size_t at = 0; at < kLevelSources.size(); ++at) {
+        const LevelSource& source = kLevelSources[at];
+        const Quantity* q = quantityOf(source);
+        if (q == nullptr || MetricValidator::nameOf(q->property) != property) continue;
+        const auto value = singleValue(*q, dictionary);
+        if (!value) return;
+        int levelClass = 4;
+        for (int i = 0; i < 4; ++i) {
+            if (*value >= source.bounds[static_cast<std::size_t>(i)]) {
+                levelClass = i;
+                break;
+            }
+        }
+        heard_[at] =
+            Heard{ServingLevel{source.technology, source.label, *value, levelClass}, wallNs};
+        return;
+    }
+}
+
+std::optional<ServingLevel> ServingLevelTracker::current(std::int64_t wallNs) const {
+    for (const auto& heard : heard_)
+        if (heard && wallNs - heard->wallNs <= kFreshNs) return heard->level;
+    return std::nullopt;
+}
+
+}  // namespace pyx
