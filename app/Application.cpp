@@ -21,6 +21,7 @@
 #include "metrics/MetricValidator.h"
 #include "metrics/history/History.h"
 #include "sources/Source.h"
+#include "ui/DriveTrack.h"
 #ifdef PYXON_HAVE_WINDOW
 #include "ui/ChartScreens.h"
 #include "ui/qt/QtFrontEnd.h"
@@ -127,13 +128,21 @@ int runPyxon(int argc, char** argv) {
 
     const RejectedRecords rejected(MainQueue::shared());
 
+    // Where the drive went (--gps): fixes arrive on the gpsd client's thread and are taken in
+    // on the main thread, with the serving level the store shows then.
+    const auto drive = std::make_shared<DriveTrack>();
     std::optional<ProgramSource> source;
     try {
-        source.emplace(openProgramSource(options.source, PYXON_VERSION));
+        source.emplace(
+            openProgramSource(options.source, PYXON_VERSION, {}, [drive](const gps::Fix& fix) {
+                MainQueue::shared().post([drive, fix] { drive->addFix(fix); });
+            }));
     } catch (const sources::SourceError& e) {
         std::cerr << "pyxon: " << e.what() << "\n";
         return 2;
     }
+    if (const gps::GpsdClient* gps = source->gps())
+        drive->followGpsd([gps] { return gps->state(); }, gps->address().text());
 
     AppDelegate appDelegate;
     appDelegate.applicationDidFinishLaunchingWithOptions(Dict{});
@@ -143,6 +152,7 @@ int runPyxon(int argc, char** argv) {
     RootNavigationController root;
     // The charts' history, fed by the store on every stored arrival.
     root.myMetricValidator->setHistory(std::make_shared<History>());
+    drive->setStore(root.myMetricValidator);
 
     int status = 0;
 #ifdef PYXON_HAVE_WINDOW
@@ -150,6 +160,7 @@ int runPyxon(int argc, char** argv) {
         WindowOptions windowOptions;
         windowOptions.screenshotDir = options.screenshots;
         windowOptions.chart = chart;
+        windowOptions.drive = drive;
         status = runWindow(argc, argv, windowOptions, [&root] { root.viewDidLoad(); });
     } else {
         status = runHeadless(root);

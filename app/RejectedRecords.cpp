@@ -19,7 +19,7 @@ RejectedRecords::RejectedRecords(MainQueue& queue) : queue_(queue) {
                     ? format("0x%llX", static_cast<unsigned long long>(*rejection.metricID()))
                     : std::string("(none)");
             systemFault(format("pyxon: rejected metric record %s: %s", id.c_str(),
-                             rejection.reason().c_str()));
+                               rejection.reason().c_str()));
         }
     });
 }
@@ -28,7 +28,7 @@ RejectedRecords::~RejectedRecords() {
     queue_.setErrorHandler({});
     if (count_ > 0)
         systemFault(format("pyxon: %llu metric records rejected in all",
-                         static_cast<unsigned long long>(count_)));
+                           static_cast<unsigned long long>(count_)));
 }
 
 }  // namespace pyx

@@ -9,13 +9,13 @@
 #include "baseband/EventRecord.h"
 #include "core/Format.h"
 #include "metrics/MetricValidator.h"
+#include "metrics/history/ServingLevel.h"
 #include "recordings/RecordingError.h"
 #include "tools/DecodeCommand.h"
 #include "tools/FlatFields.h"
 #include "tools/IsoTime.h"
 #include "tools/MetricIDText.h"
 #include "tools/PositionJoin.h"
-#include "tools/ServingLevel.h"
 
 namespace pyx {
 namespace {

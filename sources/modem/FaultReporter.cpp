@@ -40,7 +40,7 @@ void FaultReporter::once(const std::string& line) {
     if (said_.size() == kOnceLimit) {
         full_ = true;
         systemFault("the modem source has said " + std::to_string(kOnceLimit) +
-                  " different faults of what ModemManager gives; further faults not shown");
+                    " different faults of what ModemManager gives; further faults not shown");
         return;
     }
     said_.insert(std::move(key));

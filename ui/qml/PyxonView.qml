@@ -92,11 +92,38 @@ FocusScope {
             }
         }
 
+        Item {
+            id: mapButton
+            objectName: "mapButton"
+            anchors { right: parent.right; top: parent.top; bottom: parent.bottom }
+            width: mapLabel.implicitWidth + 24
+            visible: root.navigator.mapOffered && root.navigator.depth === 1
+            Accessible.role: Accessible.Button
+            Accessible.name: "Drive map"
+
+            Text {
+                id: mapLabel
+                anchors { right: parent.right; rightMargin: 12; verticalCenter: parent.verticalCenter }
+                text: "Map"
+                font.pixelSize: 17
+                color: mapArea.pressed ? Qt.darker(sys.highlight, 1.3) : sys.highlight
+            }
+            MouseArea {
+                id: mapArea
+                anchors.fill: parent
+                onClicked: {
+                    root.keyboardActive = false
+                    root.navigator.openDriveMap()
+                }
+            }
+        }
+
         Text {
             id: titleLabel
             objectName: "titleLabel"
             anchors.centerIn: parent
-            width: bar.width - 2 * Math.max(backButton.width, chartButton.visible ? chartButton.width : 16, 16) - 8
+            width: bar.width - 2 * Math.max(backButton.width, chartButton.visible ? chartButton.width : 16,
+                                            mapButton.visible ? mapButton.width : 16, 16) - 8
             horizontalAlignment: Text.AlignHCenter
             text: root.title
             elide: Text.ElideRight
@@ -116,7 +143,7 @@ FocusScope {
     StackView {
         id: stack
         objectName: "stack"
-        anchors { left: parent.left; right: parent.right; top: bar.bottom; bottom: parent.bottom }
+        anchors { left: parent.left; right: parent.right; top: bar.bottom; bottom: statusLine.top }
         focus: true
         onCurrentItemChanged: if (root.activeFocus) root.focusCurrent()
         initialItem: ScreenPage {
@@ -135,11 +162,45 @@ FocusScope {
         id: chartComponent
         ChartPage {}
     }
+    Component {
+        id: mapComponent
+        DriveMapPage {}
+    }
+
+    // The status line: what the GPS receiver gives (or why nothing), with --gps.
+    Rectangle {
+        id: statusLine
+        objectName: "statusLine"
+        anchors { left: parent.left; right: parent.right; bottom: parent.bottom }
+        height: visible ? 26 : 0
+        visible: root.navigator.gpsStatus.length > 0
+        color: sys.window
+        Rectangle {
+            anchors { left: parent.left; right: parent.right; top: parent.top }
+            height: 1
+            color: sys.mid
+            opacity: 0.6
+        }
+        Text {
+            objectName: "gpsStatus"
+            anchors { left: parent.left; leftMargin: 12; right: parent.right; rightMargin: 12; verticalCenter: parent.verticalCenter }
+            text: root.navigator.gpsStatus
+            elide: Text.ElideRight
+            font.pixelSize: 13
+            color: sys.windowText
+        }
+        Timer {
+            interval: 1000
+            repeat: true
+            running: root.navigator.mapOffered
+            onTriggered: root.navigator.updateGpsStatus()
+        }
+    }
 
     Connections {
         target: root.navigator
         function onPushed(screen) {
-            stack.push(screen.chart ? chartComponent : pageComponent, { screen: screen, navigator: root.navigator, colors: sys, view: root },
+            stack.push(screen.chart ? chartComponent : screen.map ? mapComponent : pageComponent, { screen: screen, navigator: root.navigator, colors: sys, view: root },
                        root.navigator.animated ? StackView.PushTransition : StackView.Immediate)
         }
         function onPopped() {

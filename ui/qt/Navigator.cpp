@@ -3,6 +3,7 @@
 #include <QPointer>
 
 #include <algorithm>
+#include <chrono>
 #include <utility>
 
 #include "core/MainQueue.h"
@@ -25,6 +26,11 @@ Screen::Screen(QString title, ChartModel* chart, QObject* parent)
     chart_->setParent(this);
 }
 
+Screen::Screen(QString title, DriveMapModel* map, QObject* parent)
+    : QObject(parent), title_(std::move(title)), map_(map) {
+    map_->setParent(this);
+}
+
 void Screen::update() {
     if (model_ == nullptr) return;
     MainQueue::shared().post([model = QPointer<TableModel>(model_)] {
@@ -32,8 +38,10 @@ void Screen::update() {
     });
 }
 
-Navigator::Navigator(std::shared_ptr<MetricValidator> validator, QObject* parent)
-    : QObject(parent), validator_(std::move(validator)) {
+Navigator::Navigator(std::shared_ptr<MetricValidator> validator,
+                     std::shared_ptr<const DriveTrack> drive, QObject* parent)
+    : QObject(parent), validator_(std::move(validator)), drive_(std::move(drive)) {
+    updateGpsStatus();
     stack_.push_back(new Screen(QStringLiteral("Pyxon"),
                                 std::make_shared<PyxViewController>(*validator_), std::nullopt,
                                 this));
@@ -85,6 +93,23 @@ bool Navigator::openChart() {
     const Chart chart = *top->chartOffered();
     push(new Screen(QString::fromUtf8(chartTitle(chart)), new ChartModel(history, chart), this));
     return true;
+}
+
+bool Navigator::openDriveMap() {
+    if (!drive_) return false;
+    push(new Screen(QStringLiteral("Drive map"), new DriveMapModel(drive_), this));
+    return true;
+}
+
+void Navigator::updateGpsStatus() {
+    if (!drive_ || !drive_->gpsOn()) return;
+    const auto now = std::chrono::duration_cast<std::chrono::nanoseconds>(
+                         std::chrono::system_clock::now().time_since_epoch())
+                         .count();
+    const QString text = QString::fromStdString(drive_->statusText(now));
+    if (text == gpsStatus_) return;
+    gpsStatus_ = text;
+    emit gpsStatusChanged();
 }
 
 void Navigator::push(Screen* screen) {

@@ -13,8 +13,10 @@
 
 #include "metrics/MetricValidator.h"
 #include "metrics/history/Chart.h"
+#include "ui/DriveTrack.h"
 #include "ui/TableController.h"
 #include "ui/qt/ChartModel.h"
+#include "ui/qt/DriveMapModel.h"
 #include "ui/qt/TableModel.h"
 
 namespace pyx::qt {
@@ -29,6 +31,7 @@ class Screen : public QObject {
     Q_PROPERTY(bool leadsFurther READ leadsFurther CONSTANT)
     Q_PROPERTY(bool charted READ charted CONSTANT)
     Q_PROPERTY(pyx::qt::ChartModel* chart READ chart CONSTANT)
+    Q_PROPERTY(pyx::qt::DriveMapModel* map READ map CONSTANT)
 
   public:
     // A table; charted: the chart page it offers, if any.
@@ -36,6 +39,8 @@ class Screen : public QObject {
            std::optional<Chart> charted = std::nullopt, QObject* parent = nullptr);
     // A chart page drawing chart (which the screen takes as its child).
     Screen(QString title, ChartModel* chart, QObject* parent = nullptr);
+    // The Drive map page drawing map (which the screen takes as its child).
+    Screen(QString title, DriveMapModel* map, QObject* parent = nullptr);
 
     [[nodiscard]] QString title() const { return title_; }
     // The table's model; null for a chart page.
@@ -49,6 +54,8 @@ class Screen : public QObject {
     [[nodiscard]] const std::optional<Chart>& chartOffered() const { return charted_; }
     // The chart page's model; null for a table.
     [[nodiscard]] ChartModel* chart() const { return chart_; }
+    // The Drive map page's model; null otherwise.
+    [[nodiscard]] DriveMapModel* map() const { return map_; }
     // The table's controller; only for a table.
     [[nodiscard]] TableController& controller() const { return *controller_; }
 
@@ -61,6 +68,7 @@ class Screen : public QObject {
     TableModel* model_ = nullptr;
     std::optional<Chart> charted_;
     ChartModel* chart_ = nullptr;
+    DriveMapModel* map_ = nullptr;
 };
 
 class Navigator : public QObject {
@@ -70,10 +78,14 @@ class Navigator : public QObject {
     Q_PROPERTY(int refreshIntervalMs READ refreshIntervalMs WRITE setRefreshIntervalMs NOTIFY
                    refreshIntervalMsChanged)
     Q_PROPERTY(bool animated READ animated WRITE setAnimated NOTIFY animatedChanged)
+    Q_PROPERTY(bool mapOffered READ mapOffered CONSTANT)
+    Q_PROPERTY(QString gpsStatus READ gpsStatus NOTIFY gpsStatusChanged)
 
   public:
-    // validator: the store the category screens read.
-    explicit Navigator(std::shared_ptr<MetricValidator> validator, QObject* parent = nullptr);
+    // validator: the store the category screens read; drive: the track the Drive map page
+    // draws and the status line speaks of (none: neither is offered).
+    explicit Navigator(std::shared_ptr<MetricValidator> validator,
+                       std::shared_ptr<const DriveTrack> drive = {}, QObject* parent = nullptr);
     ~Navigator() override;
 
     [[nodiscard]] int depth() const { return static_cast<int>(stack_.size()); }
@@ -94,6 +106,14 @@ class Navigator : public QObject {
     [[nodiscard]] bool chartsOffered() const { return validator_->history() != nullptr; }
     // Pushes the chart page of the top screen; false when it offers none.
     Q_INVOKABLE bool openChart();
+    // Whether the launch list offers the Drive map page.
+    [[nodiscard]] bool mapOffered() const { return drive_ != nullptr; }
+    // Pushes the Drive map page; false when none is offered.
+    Q_INVOKABLE bool openDriveMap();
+    // The status line's text about GPS; empty without --gps. Refreshed by
+    // updateGpsStatus (the window calls it once a second).
+    [[nodiscard]] QString gpsStatus() const { return gpsStatus_; }
+    Q_INVOKABLE void updateGpsStatus();
     // Pops the top screen; false on the launch list.
     Q_INVOKABLE bool back();
     Q_INVOKABLE void popToRoot();
@@ -114,11 +134,14 @@ class Navigator : public QObject {
     void rootViewDidLoad();
     void refreshIntervalMsChanged();
     void animatedChanged();
+    void gpsStatusChanged();
 
   private:
     void push(Screen* screen);
 
     std::shared_ptr<MetricValidator> validator_;
+    std::shared_ptr<const DriveTrack> drive_;
+    QString gpsStatus_;
     std::vector<Screen*> stack_;    // children of the navigator, launch list first
     std::vector<Screen*> retired_;  // popped, still drawn by the view until it releases them
     int refreshIntervalMs_ = 5000;

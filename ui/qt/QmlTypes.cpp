@@ -5,6 +5,7 @@
 #include <mutex>
 
 #include "ui/qt/ChartModel.h"
+#include "ui/qt/DriveMapModel.h"
 #include "ui/qt/Navigator.h"
 #include "ui/qt/TableModel.h"
 
@@ -18,6 +19,7 @@ void registerQmlTypes() {
         qmlRegisterUncreatableType<Screen>("Pyxon", 1, 0, "Screen", made);
         qmlRegisterUncreatableType<TableModel>("Pyxon", 1, 0, "TableModel", made);
         qmlRegisterUncreatableType<ChartModel>("Pyxon", 1, 0, "ChartModel", made);
+        qmlRegisterUncreatableType<DriveMapModel>("Pyxon", 1, 0, "DriveMapModel", made);
     });
 }
 

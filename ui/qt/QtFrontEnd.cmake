@@ -9,8 +9,8 @@ endif()
 
 add_library(pyx_ui_qt STATIC
   qt/TableModel.cpp qt/Navigator.cpp qt/MainQueueBridge.cpp qt/QmlTypes.cpp
-  qt/Screenshots.cpp qt/QtFrontEnd.cpp qt/ChartModel.cpp
-  qt/TableModel.h qt/Navigator.h qt/Screenshots.h qt/ChartModel.h)
+  qt/Screenshots.cpp qt/QtFrontEnd.cpp qt/ChartModel.cpp qt/DriveMapModel.cpp
+  qt/TableModel.h qt/Navigator.h qt/Screenshots.h qt/ChartModel.h qt/DriveMapModel.h)
 set_target_properties(pyx_ui_qt PROPERTIES AUTOMOC ON)
 target_link_libraries(pyx_ui_qt
   PUBLIC pyx_ui Qt6::Core Qt6::Gui Qt6::Widgets Qt6::Qml Qt6::Quick Qt6::Charts
@@ -18,5 +18,6 @@ target_link_libraries(pyx_ui_qt
 qt_add_resources(pyx_ui_qt pyxon_qml
   PREFIX /pyxon
   BASE qml
-  FILES qml/Main.qml qml/PyxonView.qml qml/ScreenPage.qml qml/TableItem.qml qml/ChartPage.qml)
+  FILES qml/Main.qml qml/PyxonView.qml qml/ScreenPage.qml qml/TableItem.qml qml/ChartPage.qml
+        qml/DriveMapPage.qml)
 pyxon_target(pyx_ui_qt)

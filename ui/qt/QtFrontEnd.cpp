@@ -58,7 +58,7 @@ int runWindow(int& argc, char** argv, const WindowOptions& options,
     const qt::MainQueueBridge bridge;
     qt::registerQmlTypes();
 
-    qt::Navigator navigator(MetricValidator::sharedInstance());
+    qt::Navigator navigator(MetricValidator::sharedInstance(), options.drive);
     QObject::connect(
         &navigator, &qt::Navigator::rootViewDidLoad, &navigator,
         [callback = std::move(rootViewDidLoad)] {

@@ -2,11 +2,14 @@
 #pragma once
 
 #include <functional>
+#include <memory>
 #include <optional>
 #include <string>
 #include <utility>
 
 namespace pyx {
+
+class DriveTrack;
 
 struct WindowOptions {
     // When set: after screenshotDelayMs, render the launch list, each group's menu and every
@@ -17,6 +20,8 @@ struct WindowOptions {
     int screenshotChartDelayMs = 5000;
     // When set: the chart page of this (group, category) screen is opened at start.
     std::optional<std::pair<std::string, std::string>> chart;
+    // The drive's track: the Drive map page and, with --gps, the status line.
+    std::shared_ptr<const DriveTrack> drive;
 };
 
 // Creates the application, lets its event loop drain the main queue, shows the window, calls

@@ -76,7 +76,7 @@ void Screenshots::next() {
         // The charts come last, after a pause in which the history grows.
         inCharts_ = true;
         if (charts_.empty() || !navigator_.chartsOffered()) {
-            emit finished(0);
+            nextMap();
             return;
         }
         QTimer::singleShot(chartDelayMs_, this, &Screenshots::nextChart);
@@ -92,7 +92,7 @@ void Screenshots::next() {
 
 void Screenshots::nextChart() {
     if (chartsDone_ == charts_.size()) {
-        emit finished(0);
+        nextMap();
         return;
     }
     const QStringList& path = paths_[charts_[chartsDone_]];
@@ -104,7 +104,33 @@ void Screenshots::nextChart() {
     QTimer::singleShot(kChartSettleMs, this, &Screenshots::shoot);
 }
 
+void Screenshots::nextMap() {
+    if (mapDone_ || !navigator_.mapOffered()) {
+        emit finished(0);
+        return;
+    }
+    navigator_.popToRoot();
+    if (!navigator_.openDriveMap()) {
+        systemFault("pyxon: cannot open the Drive map");
+        emit finished(1);
+        return;
+    }
+    inMap_ = true;
+    QTimer::singleShot(kChartSettleMs, this, &Screenshots::shoot);
+}
+
+QString Screenshots::mapFileName() {
+    return QStringLiteral("%1-drive-map.png")
+        .arg(static_cast<int>(paths().size()) + 1, 2, 10, QChar('0'));
+}
+
 void Screenshots::shoot() {
+    if (inMap_) {
+        if (!save(folder_.filePath(mapFileName()))) return;
+        mapDone_ = true;
+        emit finished(0);
+        return;
+    }
     if (inCharts_) {
         const std::size_t index = charts_[chartsDone_];
         if (!save(folder_.filePath(fileName(static_cast<int>(index) + 1, paths_[index], true))))

@@ -1,6 +1,7 @@
 // Renders every screen of the menu to PNG files: the launch list, each group's menu, then the
 // category screen of every menu pair, navigating the way a user would; then, after a pause
-// that lets the history grow, the chart page of every category screen that has one.
+// that lets the history grow, the chart page of every category screen that has one, and last
+// the Drive map page.
 #pragma once
 
 #include <QDir>
@@ -37,6 +38,8 @@ class Screenshots : public QObject {
     [[nodiscard]] static std::vector<int> chartNumbers();
     // "12-lte-serving-cell-meas.png", or with chart "12-lte-serving-cell-meas-chart.png".
     [[nodiscard]] static QString fileName(int number, const QStringList& path, bool chart = false);
+    // The Drive map's shot, numbered after the screens: "44-drive-map.png".
+    [[nodiscard]] static QString mapFileName();
 
   signals:
     void finished(int status);
@@ -48,6 +51,7 @@ class Screenshots : public QObject {
 
     void next();
     void nextChart();
+    void nextMap();
     void shoot();
     // Grabs the window into file; false (after finishing with 1) when it cannot.
     bool save(const QString& file);
@@ -61,6 +65,8 @@ class Screenshots : public QObject {
     std::vector<std::size_t> charts_;  // into paths_
     std::size_t chartsDone_ = 0;
     bool inCharts_ = false;
+    bool inMap_ = false;
+    bool mapDone_ = false;
 };
 
 }  // namespace pyx::qt

@@ -1,6 +1,7 @@
 // Qt Quick Test runner for the window's QML: a navigator over a store of its own (as
 // "testNavigator") and a way to put metrics into that store and its history (as
-// "testStore"). A widgets application, as the window's: the chart pages need one.
+// "testStore"), and a drive track for the Drive map page ("testDrive"). A widgets application,
+// as the window's: the chart pages need one.
 #include <QApplication>
 #include <QObject>
 #include <QQmlContext>
@@ -14,6 +15,7 @@
 
 #include "metrics/MetricValidator.h"
 #include "metrics/history/History.h"
+#include "ui/DriveTrack.h"
 #include "ui/qt/MainQueueBridge.h"
 #include "ui/qt/Navigator.h"
 #include "ui/qt/QmlTypes.h"
@@ -74,6 +76,25 @@ class TestStore : public QObject {
     std::shared_ptr<pyx::MetricValidator> store_;
 };
 
+// Puts points on the drive track from QML.
+class TestDrive : public QObject {
+    Q_OBJECT
+
+  public:
+    explicit TestDrive(std::shared_ptr<pyx::DriveTrack> track) : track_(std::move(track)) {}
+
+    // levelClass: 0 (excellent) to 4 (very poor) of an LTE RSRP of dBm; -1: no level.
+    Q_INVOKABLE void addPoint(double lat, double lon, int levelClass, double dBm) {
+        pyx::DrivePoint point{lat, lon, std::nullopt};
+        if (levelClass >= 0) point.level = pyx::ServingLevel{"LTE", "RSRP", dBm, levelClass};
+        track_->addPoint(point);
+    }
+    Q_INVOKABLE void clear() { track_->clear(); }
+
+  private:
+    std::shared_ptr<pyx::DriveTrack> track_;
+};
+
 class Setup : public QObject {
     Q_OBJECT
 
@@ -86,16 +107,21 @@ class Setup : public QObject {
     void qmlEngineAvailable(QQmlEngine* engine) {
         auto store = pyx::MetricValidator::create(nullptr);
         store->setHistory(std::make_shared<pyx::History>());
-        auto navigator = std::make_unique<pyx::qt::Navigator>(store);
+        auto track = std::make_shared<pyx::DriveTrack>(store);
+        auto navigator = std::make_unique<pyx::qt::Navigator>(store, track);
         auto testStore = std::make_unique<TestStore>(store);
+        auto testDrive = std::make_unique<TestDrive>(track);
         engine->rootContext()->setContextProperty("testNavigator", navigator.get());
         engine->rootContext()->setContextProperty("testStore", testStore.get());
+        engine->rootContext()->setContextProperty("testDrive", testDrive.get());
         navigators_.push_back(std::move(navigator));
         stores_.push_back(std::move(testStore));
+        drives_.push_back(std::move(testDrive));
     }
     void cleanupTestCase() {
         navigators_.clear();
         stores_.clear();
+        drives_.clear();
         bridge_.reset();
     }
 
@@ -103,6 +129,7 @@ class Setup : public QObject {
     std::unique_ptr<pyx::qt::MainQueueBridge> bridge_;
     std::vector<std::unique_ptr<pyx::qt::Navigator>> navigators_;
     std::vector<std::unique_ptr<TestStore>> stores_;
+    std::vector<std::unique_ptr<TestDrive>> drives_;
 };
 
 }  // namespace

@@ -12,6 +12,7 @@
 
 #include "metrics/MetricValidator.h"
 #include "metrics/history/History.h"
+#include "ui/DriveTrack.h"
 #include "ui/qt/QtFrontEnd.h"
 #include "ui/qt/Screenshots.h"
 
@@ -51,6 +52,12 @@ TEST(Window, ScreenshotModeRendersEveryScreenThenQuitsWithZero) {
     options.screenshotDir = dir.string();
     options.screenshotDelayMs = 0;
     options.screenshotChartDelayMs = 0;
+    // A short drive, so that the Drive map has points to show.
+    auto drive = std::make_shared<DriveTrack>();
+    for (int i = 0; i < 30; ++i)
+        drive->addPoint(DrivePoint{48.8566 + i * 0.0002, 2.3522 + i * 0.0003,
+                                   ServingLevel{"LTE", "RSRP", -80.0 - i, i / 6}});
+    options.drive = drive;
     const int status = runWindow(argc, argv.data(), options, [&rootViewLoads] { ++rootViewLoads; });
 
     EXPECT_EQ(status, 0);
@@ -62,7 +69,8 @@ TEST(Window, ScreenshotModeRendersEveryScreenThenQuitsWithZero) {
         ++files;
     }
     const auto charts = qt::Screenshots::chartNumbers();
-    EXPECT_EQ(files, paths.size() + charts.size());
+    EXPECT_EQ(files, paths.size() + charts.size() + 1);
+    EXPECT_EQ(pngSize(dir / qt::Screenshots::mapFileName().toStdString()).width, 390U);
     for (const int number : charts) {
         const auto file = dir / qt::Screenshots::fileName(
                                     number, paths[static_cast<std::size_t>(number - 1)], true)

@@ -1,6 +1,7 @@
-// The serving cell's signal level as an export follows it event by event: LTE RSRP, the UMTS
-// serving RSSI (the WCDMA measurement the store keeps has no RSCP), GSM idle RxLev, each read
-// where the charts read it, and the level class a map colours it by.
+// The serving cell's signal level: LTE RSRP, the UMTS serving RSSI (the WCDMA measurement the
+// store keeps has no RSCP), GSM idle RxLev, each read where the charts read it, and the level
+// class a map colours it by. An export follows it event by event; the drive map takes it from
+// the store as each fix arrives.
 #pragma once
 
 #include <array>
@@ -9,6 +10,7 @@
 #include <string_view>
 
 #include "core/Value.h"
+#include "metrics/MetricValidator.h"
 
 namespace pyx {
 
@@ -44,5 +46,8 @@ class ServingLevelTracker {
     };
     std::array<std::optional<Heard>, 3> heard_;  // by technology, LTE first
 };
+
+// The level the store shows now: LTE before UMTS before GSM, the first the store holds.
+[[nodiscard]] std::optional<ServingLevel> servingLevelOf(const MetricValidator& store);
 
 }  // namespace pyx

@@ -1,4 +1,4 @@
-#include "tools/ServingLevel.h"
+#include "metrics/history/ServingLevel.h"
 
 #include "metrics/history/Quantity.h"
 
@@ -27,7 +27,26 @@ const Quantity* quantityOf(const LevelSource& source) {
     return nullptr;
 }
 
+int classOf(const LevelSource& source, double dBm) {
+    for (std::size_t i = 0; i < source.bounds.size(); ++i)
+        if (dBm >= source.bounds[i]) return static_cast<int>(i);
+    return static_cast<int>(source.bounds.size());
+}
+
 }  // namespace
+
+std::optional<ServingLevel> servingLevelOf(const MetricValidator& store) {
+    for (const LevelSource& source : kLevelSources) {
+        const Quantity* q = quantityOf(source);
+        if (q == nullptr) continue;
+        const auto& stored = store.dictionary(q->property);
+        if (!stored) continue;
+        const auto value = singleValue(*q, *stored);
+        if (!value) continue;
+        return ServingLevel{source.technology, source.label, *value, classOf(source, *value)};
+    }
+    return std::nullopt;
+}
 
 void ServingLevelTracker::update(std::string_view property, const Dict& dictionary,
                                  std::int64_t wallNs) {
