@@ -64,11 +64,17 @@ struct EventDecoderRow {
     EventDecodeFn decode;
 };
 
-// The tables, one per technology (sources/diag/<technology>/*Decoders.cpp).
-[[nodiscard]] std::span<const LogDecoderRow> lteDecoders();
+// The tables, by technology (sources/diag/<technology>/*Decoders.cpp); LTE has one per area.
+[[nodiscard]] std::span<const LogDecoderRow> lteServingDecoders();    // serving cell, idle meas
+[[nodiscard]] std::span<const LogDecoderRow> lteConnectedDecoders();  // connected meas, CA
+[[nodiscard]] std::span<const LogDecoderRow> lteRrcDecoders();        // RRC state (OTA header)
+[[nodiscard]] std::span<const LogDecoderRow> lteTxPowerDecoders();
 [[nodiscard]] std::span<const LogDecoderRow> umtsDecoders();
 [[nodiscard]] std::span<const LogDecoderRow> gsmDecoders();
 [[nodiscard]] std::span<const LogDecoderRow> nasDecoders();
-[[nodiscard]] std::span<const EventDecoderRow> eventDecoders();
+[[nodiscard]] std::span<const EventDecoderRow> eventDecoders();  // lte/LteRrcDecoders.cpp
+
+// Every log table above, for the stream (sources/diag/DecoderTables.cpp).
+[[nodiscard]] std::span<const std::span<const LogDecoderRow>> logDecoderTables();
 
 }  // namespace pyx::diag

@@ -3,11 +3,7 @@
 
 namespace pyx::diag {
 
-std::span<const LogDecoderRow> lteDecoders() {
-    return {};
-}
-
-std::span<const EventDecoderRow> eventDecoders() {
+std::span<const LogDecoderRow> lteServingDecoders() {
     return {};
 }
 
