@@ -27,7 +27,7 @@ struct StreamStats {
     };
     Deframer::Counts frames;     // frames, bad frames (CRC), bytes
     std::uint64_t cutShort = 0;  // bytes of a final frame cut short (set by finish())
-    // Log packets by (log code, version byte; -1 for codes whose row has no version byte).
+    // Log packets by (log code, version byte payload[0], -1 for an empty payload), decoded or not.
     std::map<std::pair<std::uint16_t, int>, Counts> logs;
     // Event reports' events by event id.
     std::map<std::uint16_t, Counts> events;
