@@ -69,6 +69,8 @@ ProgramSource openProgramSource(const SourceArgs& args, const std::string& progr
     options.speed = args.speed;
     options.loop = args.loop;
     options.onEnd = std::move(onEnd);
+    // A replay hands on the positions it recorded as a gpsd client does.
+    options.onFix = onFix;
     std::shared_ptr<velk::client::Transport> transport = sources::makeTransport(options);
     std::shared_ptr<recordings::RecordingWriter> recording;
     if (args.record) {

@@ -71,8 +71,9 @@ class ProgramSource {
 
 // Opens the source args name and sets it as velk's transport factory; with --gps, starts the
 // gpsd client, whose fixes go to the recording (with --record) and to onFix (on the client's
-// thread). onEnd: called when a replay without --loop reaches the end of its recording (see
-// SourceOptions::onEnd). Throws sources::SourceError with one line saying what is wrong.
+// thread). A replay hands its recorded fixes to onFix at their times (on its thread). onEnd: called
+// when a replay without --loop reaches the end of its recording (see SourceOptions::onEnd). Throws
+// sources::SourceError with one line saying what is wrong.
 [[nodiscard]] ProgramSource openProgramSource(const SourceArgs& args,
                                               const std::string& programVersion,
                                               std::function<void(bool damaged)> onEnd = {},

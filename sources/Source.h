@@ -13,6 +13,7 @@
 #include <string_view>
 
 #include "baseband/velk/Transport.h"
+#include "gps/Fix.h"
 #include "recordings/RecordingWriter.h"
 
 namespace pyx::sources {
@@ -50,6 +51,8 @@ struct SourceOptions {
     // replay: called once, on the replay's thread, when the replay is over: a recording
     // without loop has ended, the recording holds no events, or it is damaged (damaged: true).
     std::function<void(bool damaged)> onEnd;
+    // replay: called on the replay's thread with the recording's GPS fixes at their times.
+    std::function<void(const gps::Fix&)> onFix;
 };
 
 // The transport of a source. Throws SourceError for options that do not fit the source

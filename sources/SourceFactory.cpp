@@ -72,6 +72,7 @@ std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& opti
                 replayOptions.speed = options.speed;
                 replayOptions.loop = options.loop;
                 replayOptions.onEnd = options.onEnd;
+                replayOptions.onFix = options.onFix;
                 // What the client's serial queue and the main queue still hold: the events
                 // handed out that the store has not taken in yet.
                 replayOptions.backlog = options.backlog ? options.backlog : [] {

@@ -26,8 +26,20 @@ double checkedSpeed(double speed) {
 
 ReplayTransport::ReplayTransport(Options options)
     : options_{std::move(options.file),    checkedSpeed(options.speed), options.loop,
-               std::move(options.backlog), options.maxBacklog,          std::move(options.onEnd)},
-      reader_(options_.file) {}
+               std::move(options.backlog), options.maxBacklog,          std::move(options.onEnd),
+               std::move(options.onFix)},
+      reader_(options_.file) {
+    if (options_.onFix)
+        reader_.forEachPosition([this](const gps::Fix& fix) {
+            fixes_.push_back(fix);
+            return true;
+        });
+}
+
+void ReplayTransport::handFixes(std::int64_t wallNs, std::size_t& next) const {
+    for (; next < fixes_.size() && fixes_[next].receivedNs <= wallNs; ++next)
+        options_.onFix(fixes_[next]);
+}
 
 ReplayTransport::~ReplayTransport() {
     stopThread();
@@ -101,6 +113,8 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
         Clock::time_point start;
         bool stopped = false;
         std::uint64_t thisPass = 0;
+        std::size_t nextFix = 0;
+        bool resumed = after > 0;
         try {
             recordings::RecordingReader::Filter filter;
             filter.afterID = after;
@@ -125,6 +139,14 @@ void ReplayTransport::run(const std::stop_token& stop, const EventSink& sink) {
                     stopped = true;
                     return false;
                 }
+                if (resumed) {
+                    // Started again where it stopped: the fixes of what was played are not
+                    // played again.
+                    while (nextFix < fixes_.size() && fixes_[nextFix].receivedNs < event.wallNs)
+                        ++nextFix;
+                    resumed = false;
+                }
+                handFixes(event.wallNs, nextFix);
                 sink(event.stream, std::move(event.object));
                 ++thisPass;
                 const std::lock_guard lock(mutex_);

@@ -18,8 +18,10 @@
 #include <stop_token>
 #include <string>
 #include <thread>
+#include <vector>
 
 #include "baseband/velk/Transport.h"
+#include "gps/Fix.h"
 #include "recordings/RecordingReader.h"
 
 namespace pyx::replay {
@@ -38,6 +40,9 @@ class ReplayTransport : public velk::client::Transport {
         // without loop, at once for a recording that holds no events (loop or not), or where a
         // damaged recording breaks off (damaged: true).
         std::function<void(bool damaged)> onEnd;
+        // Called on the replay's thread with the recording's GPS fixes, each just before the
+        // first event that arrived after it when recorded.
+        std::function<void(const gps::Fix&)> onFix;
     };
 
     // Opens and checks the file; throws recordings::RecordingError (one line naming the file)
@@ -56,6 +61,8 @@ class ReplayTransport : public velk::client::Transport {
     [[nodiscard]] bool finished() const;
 
   private:
+    // Hands on the fixes that had arrived by wallNs; next: the first not yet handed on.
+    void handFixes(std::int64_t wallNs, std::size_t& next) const;
     void run(const std::stop_token& stop, const EventSink& sink);
     // Waits until the store has caught up; false when asked to stop meanwhile.
     bool waitForRoom(const std::stop_token& stop);
@@ -63,6 +70,7 @@ class ReplayTransport : public velk::client::Transport {
 
     const Options options_;
     recordings::RecordingReader reader_;
+    std::vector<gps::Fix> fixes_;  // with onFix: the recording's, by arrival
 
     std::mutex controlMutex_;   // serialises starting and stopping the thread
     mutable std::mutex mutex_;  // guards what follows

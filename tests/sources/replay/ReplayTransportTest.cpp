@@ -258,6 +258,51 @@ TEST(Replay, AtTheEndItSaysSoOnceAndHandsOutNothingMore) {
               1);
 }
 
+TEST(Replay, TheRecordedPositionsComeAtTheirTimesAmongTheEvents) {
+    const TempDir dir;
+    const std::string file = dir.file("drive.pyxrec");
+    {
+        RecordingWriter writer(recordingOptions(file));
+        int fixes = 0;
+        for (int n = 0; n < 10; ++n) {
+            writer.add(velk::kEventMetric, sampleEvent(n));
+            if (n == 2 || n == 6) {
+                // Arrival times a little apart from the events' on either side.
+                std::this_thread::sleep_for(std::chrono::milliseconds(3));
+                pyx::gps::Fix fix;
+                fix.receivedNs = std::chrono::duration_cast<std::chrono::nanoseconds>(
+                                     std::chrono::system_clock::now().time_since_epoch())
+                                     .count();
+                fix.timeNs = fix.receivedNs;
+                fix.mode = pyx::gps::FixMode::ThreeD;
+                fix.lat = 48.0 + fixes++;
+                writer.addFix(fix);
+                std::this_thread::sleep_for(std::chrono::milliseconds(3));
+            }
+        }
+    }
+    std::mutex mutex;
+    std::vector<std::string> order;
+    ReplayTransport::Options options;
+    options.file = file;
+    options.speed = 0;
+    options.onFix = [&](const pyx::gps::Fix& fix) {
+        const std::lock_guard lock(mutex);
+        order.push_back("fix " + std::to_string(static_cast<int>(fix.lat)));
+    };
+    ReplayTransport replay(options);
+    replay.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+    replay.startEvents([&](const std::string&, Value object) {
+        const std::lock_guard lock(mutex);
+        order.push_back(std::to_string(sequenceOf(object)));
+    });
+    ASSERT_TRUE(waitUntil([&] { return replay.finished(); }));
+    replay.stopEvents();
+    const std::lock_guard lock(mutex);
+    EXPECT_EQ(order, (std::vector<std::string>{"0", "1", "2", "fix 48", "3", "4", "5", "6",
+                                               "fix 49", "7", "8", "9"}));
+}
+
 TEST(Replay, WithLoopItStartsAgainFromTheFirstEventAndSaysTheEndOnce) {
     const pyx::CapturedLines log(pyx::systemLogSink());
     const TempDir dir;
