@@ -134,6 +134,21 @@ constexpr ScmrLayout kScmrLayouts[] = {
 };
 // clang-format on
 
+// Every field of a cell lies inside the cell, so that a cell that fits is read within bounds.
+constexpr bool fieldFits(Field f, std::size_t cellSize) {
+    return f.offset + 4 <= cellSize && f.shift + f.width <= 32;
+}
+constexpr bool layoutsFit() {
+    for (const ScmrLayout& l : kScmrLayouts) {
+        if (l.header < (l.validRx ? 8U : l.counted ? 6U : 4U)) return false;
+        for (const Field f : {l.rsrpRx[0], l.rsrpRx[1], l.rsrqRx[0], l.rsrqRx[1], l.snrRx[0],
+                              l.snrRx[1], l.rsrp, l.rsrq, l.rssi})
+            if (!fieldFits(f, l.cellSize)) return false;
+    }
+    return true;
+}
+static_assert(layoutsFit());
+
 const ScmrLayout* scmrLayout(std::uint8_t version) {
     for (const ScmrLayout& layout : kScmrLayouts)
         if (layout.version == version) return &layout;
@@ -328,6 +343,10 @@ constexpr std::size_t kNeighbourCellSize = 52;
 constexpr Field kNeighbourPci{0, 0, 10};
 constexpr Field kNeighbourRsrp{12, 0, 12};
 constexpr Field kNeighbourRsrq{20, 10, 10};
+
+static_assert(fieldFits(kNeighbourPci, kNeighbourCellSize) &&
+              fieldFits(kNeighbourRsrp, kNeighbourCellSize) &&
+              fieldFits(kNeighbourRsrq, kNeighbourCellSize));
 
 std::optional<LteCarrierNeighbours> measuredNeighbours(const Reader& body,
                                                        const NeighbourLayout& layout) {

@@ -644,6 +644,14 @@ TEST(LteConnectedScreens, TheAttPacketsShowOnTheServingCarrierAndNeighbourScreen
     EXPECT_EQ(shown("Secondary Cell Meas", "index"), "1");
     EXPECT_EQ(shown("Secondary Cell Meas", "rsrp"), "-107");
     EXPECT_EQ(shown("Secondary Cell Meas", "rsrq"), "-7.19");
+    // The component carrier screen shows the first row of its dictionary only, as for every
+    // source; the store holds the carriers' EARFCNs (their bandwidths are not in the packets).
+    EXPECT_EQ(shown("Component Carrier Info", "pcc_earfcn"), std::nullopt);
+    const auto& components = store->myLTECompCarrDict();
+    ASSERT_TRUE(components);
+    EXPECT_EQ(text(*components, "pcc_earfcn"), "5780");
+    EXPECT_EQ(text(*components, "scc0_earfcn"), "700");
+    EXPECT_FALSE(components->contains("pcc_bandwidth"));
 
     ASSERT_EQ(pyx::test::sectionsOn(store, "LTE", "LTE Neighbor Cell Meas"), 4);
     EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_phys_cell_id", 0), "210");
@@ -651,6 +659,51 @@ TEST(LteConnectedScreens, TheAttPacketsShowOnTheServingCarrierAndNeighbourScreen
     EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_rsrq", 0), "-16.5");
     EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_earfcn", 2), "700");
     EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_rsrp", 3), "-115");
+}
+
+// The modem's time of a captured packet as ms since 1970.
+std::uint64_t timeMsOf(const CapturedPacket& packet) {
+    constexpr std::uint64_t kGpsEpochMs = 315964800000;  // 1980-01-06 00:00:00
+    return kGpsEpochMs + (packet.timestamp >> 16) * 5 / 4;
+}
+
+// The whole AT&T capture at the packets' own times, as a replay gives it: at its end
+// (2016-01-17 03:42:44) the primary cell's last measurement shows (RSRP rx0 -109.6875, rx1
+// -120.5 dBm, RSRQ rx0 -9.875, rx1 -10.5 dB, SNR rx0 5.8, rx1 3.7 dB); the secondary
+// carrier, last measured 1.15 s into the file, is gone; the neighbours are those of the last
+// 0xB195 (PCI 173 at -114.4375 dBm / -13.5 dB, 210 at -119.375, 160 at -119.8125 dBm).
+TEST(LteConnectedScreens, TheWholeAttCaptureEndsOnItsLastMeasurements) {
+    PYX_NEED_SHARED_DIAG();
+    const auto store = MetricValidator::create(nullptr);
+    DecodeState state;
+    std::size_t withBothCarriers = 0;
+    for (const CapturedPacket& p : capturePackets(kAtt, kConnectedCodes)) {
+        const Decoded d = decodeAt(p.code, p.payload, state, timeMsOf(p));
+        ASSERT_TRUE(d.decoded);
+        feed(store, d.events);
+        withBothCarriers += state.lte.connected.carriers.size() == 2 ? 1 : 0;
+    }
+    EXPECT_GT(withBothCarriers, 200U);
+    const auto shown = [&](const std::string& category, const std::string& key, int section = 0) {
+        return pyx::test::shownOn(store, "LTE", category, key, section);
+    };
+    EXPECT_EQ(shown("Serving Cell Meas", "phy_cell_id"), "185");
+    EXPECT_EQ(shown("Serving Cell Meas", "rsrp0"), "-110");
+    EXPECT_EQ(shown("Serving Cell Meas", "rsrp1"), "-121");
+    EXPECT_EQ(shown("Serving Cell Meas", "rsrq0"), "-10");
+    EXPECT_EQ(shown("Serving Cell Meas", "rsrq1"), "-11");
+    EXPECT_EQ(shown("Serving Cell Meas", "sinr0"), "6.0");
+    EXPECT_EQ(shown("Serving Cell Meas", "sinr1"), "3.5");
+    ASSERT_EQ(pyx::test::sectionsOn(store, "LTE", "CA Status"), 1);
+    EXPECT_EQ(shown("CA Status", "index"), "0");
+    EXPECT_EQ(shown("CA Status", "dl_earfcn"), "5780");
+    EXPECT_EQ(shown("CA Status", "rsrp"), "-109");
+    EXPECT_EQ(pyx::test::sectionsOn(store, "LTE", "Secondary Cell Meas"), 0);
+    ASSERT_EQ(pyx::test::sectionsOn(store, "LTE", "LTE Neighbor Cell Meas"), 3);
+    EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_phys_cell_id", 0), "173");
+    EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_rsrp", 0), "-114");
+    EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_rsrq", 0), "-13.5");
+    EXPECT_EQ(shown("LTE Neighbor Cell Meas", "nbr_rsrp", 2), "-120");
 }
 
 TEST(LteConnectedScreens, TheVectorsShowOnTheCarrierScreens) {
