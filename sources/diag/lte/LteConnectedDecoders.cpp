@@ -39,26 +39,31 @@ std::int32_t nearest(std::int64_t num, std::int64_t den) {
 
 // The modem's units: RSRP x/16 - 180 dBm, RSRQ x/16 - 30 dB, RSSI x/16 - 110 dBm,
 // SNR x/10 - 20 dB; here as our messages hold them.
+constexpr std::int64_t kRsrpFloor = 2880;  // 180 dB in sixteenths
+constexpr std::int64_t kRsrqFloor = 480;   // 30 dB
+constexpr std::int64_t kRssiFloor = 1760;  // 110 dB
+constexpr std::int64_t kSnrFloor = 200;    // 20 dB in tenths
+
 std::int32_t rsrpDbm(std::uint32_t x) {
-    return nearest(std::int64_t{x} - 180 * 16, 16);
+    return nearest(std::int64_t{x} - kRsrpFloor, 16);
 }
 std::int32_t rsrqDb(std::uint32_t x) {
-    return nearest(std::int64_t{x} - 30 * 16, 16);
+    return nearest(std::int64_t{x} - kRsrqFloor, 16);
 }
 std::int32_t rsrpCentiDb(std::uint32_t x) {
-    return nearest((std::int64_t{x} - 180 * 16) * 100, 16);
+    return nearest((std::int64_t{x} - kRsrpFloor) * 100, 16);
 }
 std::int32_t rsrqCentiDb(std::uint32_t x) {
-    return nearest((std::int64_t{x} - 30 * 16) * 100, 16);
+    return nearest((std::int64_t{x} - kRsrqFloor) * 100, 16);
 }
 std::int32_t rssiCentiDb(std::uint32_t x) {
-    return nearest((std::int64_t{x} - 110 * 16) * 100, 16);
+    return nearest((std::int64_t{x} - kRssiFloor) * 100, 16);
 }
 std::int32_t snrHalfDb(std::uint32_t x) {
-    return nearest(std::int64_t{x} - 200, 5);
+    return nearest(std::int64_t{x} - kSnrFloor, 5);
 }
 std::int32_t snrDb(std::uint32_t x) {
-    return nearest(std::int64_t{x} - 200, 10);
+    return nearest(std::int64_t{x} - kSnrFloor, 10);
 }
 // A neighbour's RSRP as dBm + 140 (0 for -140 dBm or less, 97 for -43 dBm or more) and RSRQ
 // as (dB + 19.5) x 2 (0 to 34), the indices the neighbour lists hold.
@@ -67,7 +72,8 @@ std::int32_t rsrpIndex(std::uint32_t x) {
 }
 std::int32_t rsrqIndex(std::uint32_t x) {
     // (x/16 - 30 + 19.5) x 2 = (x - 168) / 8
-    return std::clamp(nearest(std::int64_t{x} - 168, 8), 0, 34);
+    constexpr std::int64_t kRsrqIndexFloor = 168;
+    return std::clamp(nearest(std::int64_t{x} - kRsrqIndexFloor, 8), 0, 34);
 }
 
 bool fresh(std::uint64_t measuredMs, std::uint64_t nowMs) {
@@ -81,10 +87,6 @@ bool cellsFit(const Reader& body, std::size_t header, std::size_t count, std::si
     if (!body.fits(0, header)) return false;
     const std::size_t room = body.size() - header;
     return count <= room / cellSize && room % cellSize == 0;
-}
-
-std::optional<std::uint32_t> lteBand(std::uint32_t earfcn) {
-    return modem::lteBandOfEarfcn(earfcn);
 }
 
 // ---- 0xB193 serving cell measurement response, sub-packet 0x19 ----------------------------
@@ -250,7 +252,7 @@ void writeCarriers(const std::vector<LteServingCarrier>& carriers, std::uint64_t
         scc->setIndex(c.index);
         scc->setPci(c.pci);
         scc->setDlEarfcn(c.earfcn);
-        if (const auto band = lteBand(c.earfcn)) scc->setDlRfBand(*band);
+        if (const auto band = modem::lteBandOfEarfcn(c.earfcn)) scc->setDlRfBand(*band);
         scc->setRsrp(c.rsrpCentiDb);
         scc->setRsrq(c.rsrqCentiDb);
         scc->setRssi(c.rssiCentiDb);
@@ -418,7 +420,7 @@ bool connectedNeighbourMeas(const LogPacket& packet, DecodeState& state,
     KCellularLteNbrEutraCellMeas m;
     m.setTimestamp(packet.timeMs);
     for (const LteCarrierNeighbours& list : lists) {
-        const auto band = lteBand(list.earfcn);
+        const auto band = modem::lteBandOfEarfcn(list.earfcn);
         for (const LteNeighbourCell& cell : list.cells) {
             auto meas = std::make_shared<EgwErrcNbrEutraMeas>();
             meas->setNbrEarfcn(list.earfcn);
