@@ -315,7 +315,7 @@ bool servingCellMeasResponse(const LogPacket& packet, DecodeState& state,
             c.rsrpCentiDb = rsrpCentiDb(cell.rsrp);
             c.rsrqCentiDb = rsrqCentiDb(cell.rsrq);
             c.rssiCentiDb = rssiCentiDb(cell.rssi);
-            if (cell.snrRx[0]) c.snrDb = snrDb(*cell.snrRx[0]);
+            if (const auto snr = std::max(cell.snrRx[0], cell.snrRx[1])) c.snrDb = snrDb(*snr);
             c.measuredMs = packet.timeMs;
             remember(carriers, c);
         }

@@ -18,11 +18,12 @@ struct LteServingCarrier {
     std::uint32_t index = 0;  // serving-cell index: 0 the primary cell, 1-7 secondary cells
     std::uint32_t earfcn = 0;
     std::uint32_t pci = 0;
-    // Over the receive chains, as the modem combines them; hundredths of a dB(m).
+    // Over the receive chains, as the modem combines them (in every packet of the captures
+    // the better chain's value); hundredths of a dB(m).
     std::int32_t rsrpCentiDb = 0;
     std::int32_t rsrqCentiDb = 0;
     std::int32_t rssiCentiDb = 0;
-    std::optional<std::int32_t> snrDb;  // the first receive chain's, when it is valid
+    std::optional<std::int32_t> snrDb;  // the better of the valid chains', the same way
     std::uint64_t measuredMs = 0;
 };
 

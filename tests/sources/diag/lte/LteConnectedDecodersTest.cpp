@@ -475,6 +475,32 @@ TEST(LteConnectedCaptures, BlerServingMeasV36GivesOnlyTheServingCell) {
     EXPECT_EQ(text(element(status, "scc_list", 0), "rsrp"), "-9919");  // -99.1875 dBm
 }
 
+// bler_sample 0xB193 number 1206: valid receive chains 2 (chain 1 only), EARFCN 3683 (band 8),
+// PCI 351: chain 1 RSRP -113.0625 dBm, RSRQ -9.6875 dB, SNR 10.8 dB; chain 0 reads the floor
+// (-180 dBm, -30 dB, -20 dB) and is left out.
+TEST(LteConnectedCaptures, AChainTheModemMarksNotValidIsLeftOut) {
+    PYX_NEED_SHARED_DIAG();
+    DecodeState state;
+    const Decoded d = decode(
+        table(), kServingMeas,
+        capturedPacket(kBler, kServingMeas, 1206, "0101709219240c02630e0000010002005f110000"),
+        state);
+    ASSERT_TRUE(d.decoded);
+    const Dict sample = elementOf(d.events, id::K_LTE_RSRP_RSRQ_SINR, "inst_values");
+    EXPECT_EQ(text(sample, "phy_cell_id"), "351");
+    EXPECT_FALSE(sample.contains("rsrp0"));
+    EXPECT_FALSE(sample.contains("rsrq0"));
+    EXPECT_FALSE(sample.contains("sinr0"));
+    EXPECT_EQ(text(sample, "rsrp1"), "-113");
+    EXPECT_EQ(text(sample, "rsrq1"), "-10");
+    EXPECT_EQ(text(sample, "sinr1"), "22");
+    const Dict pcell = elementOf(d.events, id::K_LTE_CA_STATUS, "scc_list");
+    EXPECT_EQ(text(pcell, "dl_earfcn"), "3683");
+    EXPECT_EQ(text(pcell, "dl_rf_band"), "8");
+    EXPECT_EQ(text(pcell, "rsrp"), "-11306");
+    EXPECT_EQ(text(pcell, "snr"), "11");  // the valid chain's
+}
+
 // AT&T 0xB195 numbers 0 and 1 (request v3, then response v4): on the primary carrier 5780,
 // PCI 210 at -117.75 dBm / -16.75 dB and PCI 172 at -123.625 dBm / -20.6875 dB; on the
 // secondary carrier 700 (serving-cell index 1), PCI 210 at -112.0625 dBm / -14.375 dB and
@@ -514,6 +540,36 @@ TEST(LteConnectedCaptures, AttNeighbourMeasListsTheNeighboursOfBothCarriers) {
     EXPECT_EQ(text(other, "nbr_rsrp"), "28");                              // -112 dBm
     EXPECT_EQ(text(other, "nbr_rsrq"), "10");                              // -14.5 dB
     EXPECT_EQ(text(element(both, "meas_nbr_eutra", 3), "nbr_rsrq"), "5");  // -17.0 dB
+}
+
+// A response of version 3 holds the EARFCN in 16 bits and no padding before its cells
+// (MobileInsight's tables; no capture has one): the AT&T response number 0 written so reads
+// the same.
+TEST(LteConnectedCaptures, ANeighbourResponseOfVersion3ReadsAsVersion4Does) {
+    PYX_NEED_SHARED_DIAG();
+    const Bytes v4 = capturePayloads(kAtt, kNeighbourMeas).at(0);
+    const std::size_t response = 4 + static_cast<std::size_t>(v4[6] | v4[7] << 8);
+    ASSERT_EQ(v4[response], 0x1F);
+    ASSERT_EQ(v4[response + 1], 4);
+    const std::size_t size = static_cast<std::size_t>(v4[response + 2] | v4[response + 3] << 8);
+    ASSERT_EQ(response + size, v4.size());
+    Bytes v3(v4.begin(), v4.begin() + static_cast<std::ptrdiff_t>(response));
+    const std::size_t v3Size = size - 4;
+    for (const std::uint8_t b :
+         {std::uint8_t{0x1F}, std::uint8_t{3}, static_cast<std::uint8_t>(v3Size & 0xFF),
+          static_cast<std::uint8_t>(v3Size >> 8), v4[response + 4], v4[response + 5],
+          v4[response + 8], v4[response + 9]})
+        v3.push_back(b);
+    v3.insert(v3.end(), v4.begin() + static_cast<std::ptrdiff_t>(response + 12), v4.end());
+    DecodeState state4;
+    DecodeState state3;
+    const Decoded d4 = decode(table(), kNeighbourMeas, v4, state4);
+    const Decoded d3 = decode(table(), kNeighbourMeas, v3, state3);
+    ASSERT_TRUE(d4.decoded);
+    ASSERT_TRUE(d3.decoded);
+    EXPECT_TRUE(eventOf(d3.events, id::K_LTE_INTRARAT_MEAS) ==
+                eventOf(d4.events, id::K_LTE_INTRARAT_MEAS));
+    EXPECT_EQ(lengthOf(eventOf(d3.events, id::K_LTE_INTRARAT_MEAS), "meas_nbr_eutra"), 2U);
 }
 
 // Every 0xB193 and 0xB195 packet of the four captures that have them decodes, and what it
