@@ -8,6 +8,7 @@
 #include <variant>
 
 #include "metrics/MetricCatalogue.h"
+#include "sources/diag/decode/ByteReader.h"
 #include "tests/sources/diag/support/DiagVectors.h"
 
 namespace pyx::diag::test {
@@ -169,8 +170,11 @@ std::vector<CapturedPacket> capturePackets(const std::string& file,
             const auto code =
                 static_cast<std::uint16_t>(body.size() >= 16 ? body[6] | body[7] << 8 : 0);
             if (body[0] == 0x10 && body.size() >= 16 &&
-                std::find(codes.begin(), codes.end(), code) != codes.end())
-                packets.push_back({code, Bytes(body.begin() + 16, body.end())});
+                std::find(codes.begin(), codes.end(), code) != codes.end()) {
+                const decode::Reader header(body);
+                const std::uint64_t timestamp = header.u32(8) | std::uint64_t{header.u32(12)} << 32;
+                packets.push_back({code, Bytes(body.begin() + 16, body.end()), timestamp});
+            }
         }
         frame.clear();
     }

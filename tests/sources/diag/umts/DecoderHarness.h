@@ -57,6 +57,7 @@ std::size_t feedNoise(std::span<const LogDecoderRow> table);
 struct CapturedPacket {
     std::uint16_t code = 0;
     Bytes payload;
+    std::uint64_t timestamp = 0;  // the log header's: 1.25 ms ticks since 1980 in b16-63
 };
 [[nodiscard]] std::vector<CapturedPacket> capturePackets(const std::string& file,
                                                          std::span<const std::uint16_t> codes);
