@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
+#include <ctime>
 #include <limits>
 #include <numbers>
 
@@ -47,7 +48,19 @@ void DriveTrack::clear() {
 }
 
 std::string DriveTrack::statusText(std::int64_t nowNs) const {
-    if (!gpsdState_) return "GPS off (start with --gps)";
+    if (!gpsdState_) {
+        if (!latest_) return "GPS off (start with --gps)";
+        // A replay's fix: where the drive was then; its age says nothing now.
+        const std::int64_t ns = latest_->timeNs ? latest_->timeNs : latest_->receivedNs;
+        const auto seconds = static_cast<std::time_t>(ns / 1'000'000'000);
+        std::tm utc{};
+        gmtime_r(&seconds, &utc);
+        char text[96];
+        std::snprintf(text, sizeof text, "GPS recorded %s %.5f, %.5f at %02d:%02d:%02d UTC",
+                      latest_->mode == gps::FixMode::ThreeD ? "3D" : "2D", latest_->lat,
+                      latest_->lon, utc.tm_hour, utc.tm_min, utc.tm_sec);
+        return text;
+    }
     const gps::GpsdState state = gpsdState_();
     if (state == gps::GpsdState::Unreachable)
         return "GPS: gpsd not running at " + gpsdAddress_ + " (retrying)";

@@ -49,7 +49,8 @@ class DriveTrack {
     void setStore(std::shared_ptr<const MetricValidator> store) { store_ = std::move(store); }
     // The gpsd client's state, and its address for the status line (a run with --gps).
     void followGpsd(std::function<gps::GpsdState()> state, std::string address);
-    [[nodiscard]] bool gpsOn() const { return static_cast<bool>(gpsdState_); }
+    // Whether there is a receiver to speak of: gpsd followed, or fixes handed on by a replay.
+    [[nodiscard]] bool gpsOn() const { return static_cast<bool>(gpsdState_) || latest_; }
 
     void addFix(const gps::Fix& fix);
     void addPoint(const DrivePoint& point);
@@ -60,7 +61,9 @@ class DriveTrack {
     [[nodiscard]] std::uint64_t revision() const { return revision_; }
 
     // "GPS 3D 48.85660, 2.35220 · 1 s ago", "GPS: no fix yet", "GPS: gpsd not running at
-    // 127.0.0.1:2947 (retrying)", "GPS: fix lost 12 s ago"; nowNs: wall clock, ns since 1970.
+    // 127.0.0.1:2947 (retrying)", "GPS: fix lost 12 s ago"; without gpsd, the fixes a replay
+    // hands on: "GPS recorded 3D 48.85660, 2.35220 at 12:00:05 UTC". nowNs: wall clock, ns
+    // since 1970.
     [[nodiscard]] std::string statusText(std::int64_t nowNs) const;
 
   private:
