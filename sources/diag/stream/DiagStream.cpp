@@ -122,6 +122,26 @@ std::uint64_t modemTimeMs(std::uint64_t timestamp) {
     return kModemEpochS * 1000 + ticks * 5 / 4;
 }
 
+std::optional<LogPacket> readLogPacket(std::span<const std::uint8_t> packet) {
+    // Both lengths hold the bytes after the first one: the second length, the code, the
+    // timestamp and the payload.
+    if (packet.size() < kLogHeader || packet[0] != kLogCommand ||
+        u16At(packet, 2) != packet.size() - 4 || u16At(packet, 4) != packet.size() - 4)
+        return std::nullopt;
+    LogPacket log;
+    log.code = u16At(packet, 6);
+    log.timestamp = u64At(packet, 8);
+    log.payload = packet.subspan(kLogHeader);
+    return log;
+}
+
+std::optional<MultiSimPacket> readMultiSim(std::span<const std::uint8_t> packet) {
+    if (packet.size() <= kMultiSimHeader || packet[0] != kMultiSimCommand || packet[1] != 0x01 ||
+        packet[2] != 0 || packet[3] != 0)
+        return std::nullopt;
+    return MultiSimPacket{u32At(packet, 4), packet.subspan(kMultiSimHeader)};
+}
+
 DiagStream::DiagStream() = default;
 
 DiagStream::DiagStream(Options options) : options_(std::move(options)) {}
@@ -154,20 +174,14 @@ void DiagStream::onPacket(std::span<const std::uint8_t> packet, const EventSink&
         dispatch(packet, onEvents, onResponse);
         return;
     }
-    if (packet.size() <= kMultiSimHeader || packet[1] != 0x01 || packet[2] != 0 || packet[3] != 0) {
+    const auto multiSim = readMultiSim(packet);
+    if (!multiSim || multiSim->inner[0] == kMultiSimCommand) {
         ++stats_.malformed;
         return;
     }
-    const std::uint32_t subscription = u32At(packet, 4);
-    ++stats_.subscriptions[subscription];
-    if (!subscription_) subscription_ = subscription;
-    if (*subscription_ != subscription) return;
-    const std::span<const std::uint8_t> inner = packet.subspan(kMultiSimHeader);
-    if (inner[0] == kMultiSimCommand) {
-        ++stats_.malformed;
-        return;
-    }
-    dispatch(inner, onEvents, onResponse);
+    ++stats_.subscriptions[multiSim->subscription];
+    if (!subscription_) subscription_ = multiSim->subscription;
+    if (*subscription_ == multiSim->subscription) dispatch(multiSim->inner, onEvents, onResponse);
 }
 
 void DiagStream::dispatch(std::span<const std::uint8_t> packet, const EventSink& onEvents,
@@ -201,16 +215,12 @@ StreamStats::Counts& DiagStream::logCounts(std::uint16_t code, int version) {
 }
 
 void DiagStream::logPacket(std::span<const std::uint8_t> packet, const EventSink& onEvents) {
-    // Both lengths count the bytes after them: the code, the timestamp and the payload.
-    if (packet.size() < kLogHeader || u16At(packet, 2) != packet.size() - 4 ||
-        u16At(packet, 4) != packet.size() - 4) {
+    auto read = readLogPacket(packet);
+    if (!read) {
         ++stats_.malformed;
         return;
     }
-    LogPacket log;
-    log.code = u16At(packet, 6);
-    log.timestamp = u64At(packet, 8);
-    log.payload = packet.subspan(kLogHeader);
+    LogPacket& log = *read;
     const std::uint64_t modemMs = modemTimeMs(log.timestamp);
     const bool clockSet = modemMs >= kClockSetFromMs;
     if (clockSet) {

@@ -109,6 +109,18 @@ class DiagStream {
 // 1970; 0 for a timestamp of 0.
 [[nodiscard]] std::uint64_t modemTimeMs(std::uint64_t timestamp);
 
+// The fields of a log packet (0x10) whose declared lengths match its size (timeMs left 0), or
+// nothing; the payload points into packet.
+[[nodiscard]] std::optional<LogPacket> readLogPacket(std::span<const std::uint8_t> packet);
+
+// The subscription and inner packet of a multi-SIM packet (98 01 00 00, u32 subscription, a
+// packet of at least one byte), or nothing.
+struct MultiSimPacket {
+    std::uint32_t subscription = 0;
+    std::span<const std::uint8_t> inner;
+};
+[[nodiscard]] std::optional<MultiSimPacket> readMultiSim(std::span<const std::uint8_t> packet);
+
 // Packets as a modem writes them (for the fake modem in the tests, the benchmarks and the fuzz
 // seeds): a log packet (0x10, lengths, code, timestamp, payload), an event report (0x60) of
 // events, and a multi-SIM wrapper (0x98 01 00 00, u32 subscription, the inner packet).

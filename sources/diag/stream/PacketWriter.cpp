@@ -27,7 +27,7 @@ void putU64(Bytes& out, std::uint64_t v) {
 
 Bytes logPacket(std::uint16_t code, std::uint64_t timestamp,
                 std::span<const std::uint8_t> payload) {
-    // The lengths count the code, the timestamp and the payload (and themselves: 12 + payload).
+    // Both lengths hold the bytes after the first one: 12 + payload.
     constexpr std::size_t kCounted = 12;
     if (payload.size() > 0xFFFF - kCounted)
         throw std::length_error("log packet payload of " + std::to_string(payload.size()) +
