@@ -7,6 +7,7 @@
 
 #include "recordings/RecordingError.h"
 #include "recordings/RecordingReader.h"
+#include "tools/CaptureInfo.h"
 #include "tools/IsoTime.h"
 #include "tools/MetricIDText.h"
 
@@ -26,7 +27,12 @@ int runInfo(const std::string& file, std::ostream& out, std::ostream& err) {
     try {
         summary = recordings::RecordingReader(file).summary();
     } catch (const recordings::RecordingError& e) {
-        err << "pyxonctl info: " << e.what() << '\n';
+        // A file that is no SQLite database may be a raw DIAG capture.
+        const bool notARecording = e.kind() == recordings::RecordingError::Kind::NotARecording;
+        if (notARecording)
+            if (const auto status = runCaptureInfo(file, out)) return *status;
+        err << "pyxonctl info: " << e.what()
+            << (notARecording ? " nor a DIAG capture (no DIAG frame in it)" : "") << '\n';
         return 1;
     }
     Json kinds = Json::object();
@@ -73,10 +79,14 @@ int runInfo(const std::string& file, std::ostream& out, std::ostream& err) {
 }
 
 Subcommand addInfoCommand(CLI::App& pyxonctl) {
-    CLI::App* info =
-        pyxonctl.add_subcommand("info", "Say what a recording (.pyxrec) holds, as one JSON object");
+    CLI::App* info = pyxonctl.add_subcommand("info",
+                                             "Say what a recording (.pyxrec) or a raw DIAG capture "
+                                             "(.qmdl, .mi2log) holds, as one JSON object");
     auto file = std::make_shared<std::string>();
-    info->add_option("FILE", *file, "The recording, made with --record")->required();
+    info->add_option("FILE", *file,
+                     "The recording, made with --record, or a DIAG capture (--qmdl, or another "
+                     "tool's raw port stream)")
+        ->required();
     info->footer(
         "Example:\n"
         "  pyxonctl info drive.pyxrec\n"
@@ -88,9 +98,15 @@ Subcommand addInfoCommand(CLI::App& pyxonctl) {
         "\"car-laptop\"}],\"positions\":{\"fixes\":61,\"first\":\"...\",\"last\":\"...\","
         "\"box\":{\"south\":48.8566,\"west\":2.3522,\"north\":48.8605,\"east\":2.3611}}}\n"
         "positions: the GPS fixes of runs with --gps (their own times, the box they lie in, in "
-        "degrees), null without.\nTimes are UTC. A file that is missing, not a recording, of a "
-        "newer format or damaged "
-        "gives one\nline on stderr and exit code 1.\n");
+        "degrees), null without.\n"
+        "A DIAG capture gives, per log code and version, the packets decoded and not decoded,\n"
+        "the bad frames, the multi-SIM subscriptions and the modem's first and last time:\n"
+        "  pyxonctl info drive.qmdl\n"
+        "  {\"file\":\"drive.qmdl\",\"kind\":\"diag capture\",\"bytes\":524026,\"frames\":1808,"
+        "\"bad_frames\":0,...,\"logs\":[{\"code\":\"0xB193\",\"version\":1,\"name\":\"...\","
+        "\"decoded\":1091,\"not_decoded\":0},...],\"subscriptions\":{}}\n"
+        "Times are UTC. A file that is missing, neither a recording nor a capture, of a newer\n"
+        "format or damaged gives one line on stderr and exit code 1.\n");
     return Subcommand{info, [file] { return runInfo(*file, std::cout, std::cerr); }};
 }
 
