@@ -96,6 +96,12 @@ void DiagLink::run(const std::stop_token& stop, const DiagStream::EventSink& onE
     const auto sayOnce = [&](std::string_view line) {
         if (sessionFaults.emplace(line).second && options.onLine) options.onLine(line);
     };
+    // The session's notes (the modem's version) once per start that succeeds: a modem that
+    // fails the start-up again and again is not introduced at every try.
+    std::set<std::string, std::less<>> notes;
+    const auto note = [&](std::string_view line) {
+        if (notes.emplace(line).second && options.onLine) options.onLine(line);
+    };
     QmdlFile qmdl(options.qmdlFile, sayOnce);
     const std::string retry = every(options.retryEvery);
 
@@ -117,11 +123,12 @@ void DiagLink::run(const std::stop_token& stop, const DiagStream::EventSink& onE
             state_->stream.reset();
             DiagSession session(port, state_->stream, onEvents, signal,
                                 {.commandTimeout = options.commandTimeout,
-                                 .onNote = options.onLine,
+                                 .onNote = note,
                                  .onFault = sayOnce,
                                  .onBytes = [&qmdl](auto bytes) { qmdl.append(bytes); }});
             if (session.start()) {
                 fault.clear();
+                notes.clear();
                 state_->publish();
                 while (!signal.requested()) {
                     session.pump(kPumpPeriod);

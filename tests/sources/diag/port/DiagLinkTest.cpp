@@ -247,6 +247,65 @@ TEST(DiagLink, StartsWithVersionBuildIdRangesAndOneMaskPerEquipmentId) {
         << allLines(link.seen);
 }
 
+TEST(DiagLink, CodesBeyondTheModemsRangesAreLeftOutAndSaid) {
+    FakeDiagModem::Options modemOptions;
+    modemOptions.ranges[0xB] = 0xC1;  // LTE up to 0xB0C0 only
+    modemOptions.ranges[0x5] = 0;     // no GSM logging at all
+    FakeDiagModem modem(modemOptions);
+    RunningLink link(optionsFor(modem.path()));
+    ASSERT_TRUE(link.seen.waitForLine("DIAG logging on")) << allLines(link.seen);
+    const auto beyond = codesBeyond(modemOptions);
+    ASSERT_FALSE(beyond.empty());
+    EXPECT_EQ(link.seen.count("the modem's log ranges leave out " + std::to_string(beyond.size()) +
+                              " of the decoded log codes (" + codeList(beyond) +
+                              "); its item counts: 0x1:4095 0x4:4087 0x6:28 0x7:2910 0x9:2070 "
+                              "0xA:914 0xB:193 0xD:519"),
+              1U)
+        << allLines(link.seen);
+    const std::size_t on = DiagStream::decodedLogCodes().size() - beyond.size();
+    EXPECT_EQ(link.seen.count("DIAG logging on: " + std::to_string(on) + " log codes (" +
+                              std::to_string(beyond.size()) + " left out) and event reports"),
+              1U)
+        << allLines(link.seen);
+    const auto given = modem.masks();
+    EXPECT_FALSE(given.contains(5));
+    ASSERT_TRUE(given.contains(0xB));
+    EXPECT_EQ(given.at(0xB).items, 0xC1U);
+    EXPECT_EQ(given.at(0xB).bits, expectedMasks(modemOptions).at(0xB));
+}
+
+TEST(DiagLink, AModemWithoutBuildIdGoesOn) {
+    FakeDiagModem::Options options;
+    options.unanswered = {0x7C};
+    FakeDiagModem modem(options);
+    DiagLink::Options linkOptions = optionsFor(modem.path());
+    linkOptions.commandTimeout = 100ms;
+    RunningLink link(linkOptions);
+    ASSERT_TRUE(link.seen.waitForLine("DIAG logging on")) << allLines(link.seen);
+    EXPECT_EQ(link.seen.count("DIAG modem on " + modem.path() +
+                              ": sdx55.cp (compiled Nov  2 2021 22:13:12), no build id"),
+              1U)
+        << allLines(link.seen);
+}
+
+TEST(DiagLink, AModemThatGivesNoLogRangesIsSaidOnce) {
+    FakeDiagModem::Options options;
+    options.unanswered = {0x73};
+    FakeDiagModem modem(options);
+    DiagLink::Options linkOptions = optionsFor(modem.path());
+    linkOptions.commandTimeout = 100ms;
+    RunningLink link(linkOptions);
+    const std::string line = "no answer from " + modem.path() +
+                             " to the log range request within 100 ms; trying again every 50 ms";
+    ASSERT_TRUE(link.seen.waitForLine(line)) << allLines(link.seen);
+    ASSERT_TRUE(modem.waitForRequests([](const std::vector<Bytes>& requests) {
+        return std::count(requests.begin(), requests.end(), versionRequest()) >= 3;
+    }));
+    EXPECT_EQ(link.seen.count(line), 1U);
+    EXPECT_EQ(link.seen.count("DIAG modem on " + modem.path()), 1U) << allLines(link.seen);
+    EXPECT_EQ(link.seen.count("DIAG logging on"), 0U);
+}
+
 TEST(DiagLink, StopTurnsEventReportsAndLogMasksOff) {
     FakeDiagModem modem;
     RunningLink link(optionsFor(modem.path()));
