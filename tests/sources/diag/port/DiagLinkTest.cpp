@@ -70,6 +70,16 @@ class Seen {
         const std::lock_guard lock(mutex_);
         return lines_;
     }
+    void end() {
+        const std::lock_guard lock(mutex_);
+        ended_ = true;
+        changed_.notify_all();
+    }
+    // Waits for run() to return.
+    bool waitForEnd() {
+        std::unique_lock lock(mutex_);
+        return changed_.wait_for(lock, kDeadline, [&] { return ended_; });
+    }
     std::size_t events() {
         const std::lock_guard lock(mutex_);
         return events_;
@@ -87,6 +97,7 @@ class Seen {
     std::vector<std::string> lines_;
     std::size_t packets_ = 0;
     std::size_t events_ = 0;
+    bool ended_ = false;
 };
 
 std::string allLines(Seen& seen) {
@@ -101,6 +112,7 @@ class RunningLink {
     explicit RunningLink(DiagLink::Options options) : link_(withLines(std::move(options))) {
         thread_ = std::jthread([this](std::stop_token stop) {
             link_.run(stop, [this](DecodedPacket& packet) { seen.packet(packet); });
+            seen.end();
         });
     }
     ~RunningLink() { stop(); }
@@ -113,6 +125,8 @@ class RunningLink {
         thread_.request_stop();
         thread_.join();
     }
+    // Asks the link to stop without waiting.
+    void requestStop() { thread_.request_stop(); }
     [[nodiscard]] StreamStats stats() const { return link_.stats(); }
 
     Seen seen;
@@ -202,6 +216,14 @@ std::vector<std::uint16_t> codesBeyond(const FakeDiagModem::Options& modem) {
 
 Bytes cellIdPacket(std::uint32_t cellId) {
     return logPacket(0x4127, 0, test::wcdmaCellIdPayload(cellId));
+}
+
+// Log packets decoded and not, by (code, version).
+std::map<std::pair<std::uint16_t, int>, std::pair<std::uint64_t, std::uint64_t>> decodedByKind(
+    const StreamStats& stats) {
+    std::map<std::pair<std::uint16_t, int>, std::pair<std::uint64_t, std::uint64_t>> kinds;
+    for (const auto& [kind, counts] : stats.logs) kinds[kind] = {counts.decoded, counts.notDecoded};
+    return kinds;
 }
 
 Bytes readFile(const std::string& path) {
@@ -373,6 +395,29 @@ TEST(DiagLink, AModemThatAnswersNothingIsSaidOnce) {
                             [](const Bytes& r) { return r == versionRequest(); }));
 }
 
+TEST(DiagLink, AStopEndsAWaitForAReplyAtOnce) {
+    FakeDiagModem::Options options;
+    options.answers = false;
+    FakeDiagModem modem(options);
+    DiagLink::Options linkOptions = optionsFor(modem.path());
+    linkOptions.commandTimeout = std::chrono::minutes(10);
+    RunningLink link(linkOptions);
+    ASSERT_TRUE(modem.waitForRequest(versionRequest()));
+    link.requestStop();
+    EXPECT_TRUE(link.seen.waitForEnd());
+    EXPECT_EQ(modem.requests(), std::vector<Bytes>{versionRequest()});
+}
+
+TEST(DiagLink, AStopEndsTheWaitForAPortAtOnce) {
+    TempFolder folder;
+    DiagLink::Options options = optionsFor(folder.file("diag"));
+    options.retryEvery = std::chrono::minutes(10);
+    RunningLink link(options);
+    ASSERT_TRUE(link.seen.waitForLine("is not there")) << allLines(link.seen);
+    link.requestStop();
+    EXPECT_TRUE(link.seen.waitForEnd());
+}
+
 TEST(DiagLink, ARefusedMaskIsSaidAndTheOthersAreSet) {
     FakeDiagModem::Options options;
     options.refuseMasks = {4};
@@ -456,6 +501,14 @@ TEST(DiagLink, TheQmdlKeepsEveryByteTheModemWrote) {
     ASSERT_TRUE(eventually([&] { return link.stats().frames.bytes >= written.size(); }));
     link.stop();  // the replies to logging off are kept too
     EXPECT_EQ(readFile(options.qmdlFile), modem.written());
+    // It replays as the port read: the same packets decoded.
+    DiagStream replay;
+    std::size_t replayed = 0;
+    const Bytes kept = readFile(options.qmdlFile);
+    replay.feed(kept, [&](DecodedPacket&) { ++replayed; });
+    EXPECT_GT(replayed, 0U);
+    EXPECT_EQ(replay.stats().frames.badFrames, 1U);
+    EXPECT_EQ(decodedByKind(replay.stats()), decodedByKind(link.stats()));
 }
 
 TEST(DiagLink, NoPortFoundListsTheSerialInterfacesSeen) {
