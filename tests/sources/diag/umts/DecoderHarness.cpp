@@ -177,4 +177,119 @@ std::vector<CapturedPacket> capturePackets(const std::string& file,
     return packets;
 }
 
+const EventDecoderRow* eventRowFor(std::span<const EventDecoderRow> table, std::uint16_t id) {
+    for (const EventDecoderRow& row : table)
+        if (row.id == id) return &row;
+    return nullptr;
+}
+
+Decoded decodeEvent(std::span<const EventDecoderRow> table, std::uint16_t id,
+                    std::span<const std::uint8_t> payload, DecodeState& state,
+                    std::uint64_t timeMs) {
+    Decoded result;
+    const EventDecoderRow* row = eventRowFor(table, id);
+    if (row == nullptr) return result;
+    EventReport event;
+    event.id = id;
+    event.timeMs = timeMs;
+    event.payload = payload;
+    result.decoded = row->decode(event, state, result.events);
+    return result;
+}
+
+std::size_t feedEventNoise(std::span<const EventDecoderRow> table) {
+    std::uint32_t seed = 0x9E3779B9;
+    const auto next = [&] {
+        seed ^= seed << 13;
+        seed ^= seed >> 17;
+        seed ^= seed << 5;
+        return seed;
+    };
+    std::size_t taken = 0;
+    DecodeState state;
+    for (const EventDecoderRow& row : table) {
+        for (std::size_t length = 0; length <= 40; ++length) {
+            for (int round = 0; round < 64; ++round) {
+                Bytes payload(length);
+                // Small values now and then, where the rows' arguments lie.
+                for (std::uint8_t& b : payload)
+                    b = static_cast<std::uint8_t>(round % 2 == 0 ? next() : next() % 8);
+                const Decoded d = decodeEvent(table, row.id, payload, state, kTimeMs + 10U * taken);
+                if (!d.decoded) continue;
+                ++taken;
+                for (const MetricOut& e : d.events) {
+                    const MetricKind* kind = findMetricKind(e.metricID);
+                    if (kind == nullptr || !kind->decodable()) {
+                        ADD_FAILURE() << row.name << " wrote an unknown kind " << e.metricID;
+                        continue;
+                    }
+                    const auto decodedEvent = kind->decode(e.payload);
+                    EXPECT_TRUE(std::holds_alternative<Dict>(decodedEvent))
+                        << row.name << ": " << kind->messageClass;
+                }
+            }
+        }
+    }
+    return taken;
+}
+
+namespace {
+
+// The frames of a capture that pass their CRC, unescaped, without the CRC, and unwrapped from
+// a multi-SIM (0x98) header.
+std::vector<Bytes> goodFrames(const std::string& file) {
+    std::ifstream in(sharedDiag() / "captures" / file, std::ios::binary);
+    const Bytes raw{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+    std::vector<Bytes> frames;
+    Bytes frame;
+    for (std::size_t i = 0; i < raw.size(); ++i) {
+        if (raw[i] != 0x7E) {
+            if (raw[i] == 0x7D && i + 1 < raw.size())
+                frame.push_back(static_cast<std::uint8_t>(raw[++i] ^ 0x20));
+            else
+                frame.push_back(raw[i]);
+            continue;
+        }
+        std::span<const std::uint8_t> body(frame);
+        if (body.size() >= 3 && crc16(body.first(body.size() - 2)) ==
+                                    (body[body.size() - 2] | body[body.size() - 1] << 8)) {
+            body = body.first(body.size() - 2);
+            if (body[0] == 0x98 && body.size() > 8) body = body.subspan(8);
+            frames.emplace_back(body.begin(), body.end());
+        }
+        frame.clear();
+    }
+    return frames;
+}
+
+}  // namespace
+
+std::vector<CapturedEvent> captureEvents(const std::string& file,
+                                         std::span<const std::uint16_t> ids) {
+    std::vector<CapturedEvent> events;
+    for (const Bytes& frame : goodFrames(file)) {
+        if (frame.size() < 3 || frame[0] != 0x60) continue;
+        const std::size_t end =
+            std::min<std::size_t>(frame.size(), 3U + (frame[1] | frame[2] << 8));
+        std::size_t at = 3;
+        while (at + 2 <= end) {
+            const auto word = static_cast<std::uint16_t>(frame[at] | frame[at + 1] << 8);
+            at += 2 + ((word & 0x8000) != 0 ? 2 : 8);
+            std::size_t length = (word >> 13) & 3;
+            if (length == 3) {
+                if (at >= end) break;
+                length = frame[at++];
+            }
+            if (at + length > end) break;
+            const auto id = static_cast<std::uint16_t>(word & 0x0FFF);
+            if (std::find(ids.begin(), ids.end(), id) != ids.end())
+                events.push_back(
+                    {id, Bytes(frame.begin() + static_cast<std::ptrdiff_t>(at),
+                               frame.begin() + static_cast<std::ptrdiff_t>(at + length))});
+            at += length;
+        }
+    }
+    return events;
+}
+
 }  // namespace pyx::diag::test
