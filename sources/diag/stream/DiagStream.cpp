@@ -244,18 +244,18 @@ void DiagStream::logPacket(std::span<const std::uint8_t> packet, const EventSink
     onEvents(decoded_);
 }
 
-void DiagStream::eventReport(std::span<const std::uint8_t> packet, const EventSink& onEvents) {
-    if (packet.size() < kEventHeader || u16At(packet, 1) != packet.size() - kEventHeader) {
-        ++stats_.malformed;
-        return;
-    }
+bool readEventReport(std::span<const std::uint8_t> packet,
+                     const std::function<void(const ReportedEvent&)>& onEvent) {
+    if (packet.size() < kEventHeader || u16At(packet, 1) != packet.size() - kEventHeader)
+        return false;
     std::size_t at = kEventHeader;
     while (at < packet.size()) {
         const std::size_t left = packet.size() - at;
         if (left < 2) break;
         const std::uint16_t word = u16At(packet, at);
-        const bool truncatedTime = (word & 0x8000) != 0;
-        const std::size_t timeSize = truncatedTime ? 2 : 8;
+        ReportedEvent event;
+        event.truncatedTime = (word & 0x8000) != 0;
+        const std::size_t timeSize = event.truncatedTime ? 2 : 8;
         const unsigned payloadCode = word >> 13 & 0x3;
         std::size_t payloadAt = 2 + timeSize;
         if (left < payloadAt) break;
@@ -266,24 +266,33 @@ void DiagStream::eventReport(std::span<const std::uint8_t> packet, const EventSi
             ++payloadAt;
         }
         if (left - payloadAt < payloadSize) break;
-
-        EventReport event;
         event.id = static_cast<std::uint16_t>(word & 0x0FFF);
+        event.timestamp = event.truncatedTime ? u16At(packet, at + 2) : u64At(packet, at + 2);
         event.payload = packet.subspan(at + payloadAt, payloadSize);
+        onEvent(event);
+        at += payloadAt + payloadSize;
+    }
+    return at == packet.size();
+}
+
+void DiagStream::eventReport(std::span<const std::uint8_t> packet, const EventSink& onEvents) {
+    const bool whole = readEventReport(packet, [&](const ReportedEvent& reported) {
+        EventReport event;
+        event.id = reported.id;
+        event.payload = reported.payload;
         // A truncated time is taken as the last full one the stream carried.
         std::uint64_t modemMs = lastModemMs_;
         bool clockSet = modemMs != 0;
-        if (!truncatedTime) {
-            modemMs = modemTimeMs(u64At(packet, at + 2));
+        if (!reported.truncatedTime) {
+            modemMs = modemTimeMs(reported.timestamp);
             clockSet = modemMs >= kClockSetFromMs;
             if (clockSet) lastModemMs_ = modemMs;
         }
         event.timeMs = messageTime(modemMs, clockSet);
         decoded_.modemTimeMs = clockSet ? modemMs : 0;
         decodeEvent(event, onEvents);
-        at += payloadAt + payloadSize;
-    }
-    if (at != packet.size()) ++stats_.malformed;
+    });
+    if (!whole) ++stats_.malformed;
 }
 
 void DiagStream::decodeEvent(const EventReport& event, const EventSink& onEvents) {

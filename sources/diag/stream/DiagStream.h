@@ -127,6 +127,18 @@ struct MultiSimPacket {
 };
 [[nodiscard]] std::optional<MultiSimPacket> readMultiSim(std::span<const std::uint8_t> packet);
 
+// One event of an event report (0x60) as it stands in the packet.
+struct ReportedEvent {
+    std::uint16_t id = 0;         // b0-11 of the event word
+    bool truncatedTime = false;   // b15: a 2-byte time (bits 16-31 of the full one)
+    std::uint64_t timestamp = 0;  // the u64, or the 2-byte truncated time
+    std::span<const std::uint8_t> payload;
+};
+// Calls onEvent for each event of an event report (60, u16 length, events) in order, as far as
+// they fit; false when the declared length does not match the packet or an event runs past it.
+[[nodiscard]] bool readEventReport(std::span<const std::uint8_t> packet,
+                                   const std::function<void(const ReportedEvent&)>& onEvent);
+
 // Packets as a modem writes them (for the fake modem in the tests, the benchmarks and the fuzz
 // seeds): a log packet (0x10, lengths, code, timestamp, payload), an event report (0x60) of
 // events, and a multi-SIM wrapper (0x98 01 00 00, u32 subscription, the inner packet).

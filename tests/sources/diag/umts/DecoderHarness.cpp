@@ -151,4 +151,77 @@ std::vector<CapturedPacket> capturePackets(const std::string& file,
     return packets;
 }
 
+const EventDecoderRow* eventRowFor(std::span<const EventDecoderRow> table, std::uint16_t id) {
+    for (const EventDecoderRow& row : table)
+        if (row.id == id) return &row;
+    return nullptr;
+}
+
+Decoded decodeEvent(std::span<const EventDecoderRow> table, std::uint16_t id,
+                    std::span<const std::uint8_t> payload, DecodeState& state,
+                    std::uint64_t timeMs) {
+    Decoded result;
+    const EventDecoderRow* row = eventRowFor(table, id);
+    if (row == nullptr) return result;
+    EventReport event;
+    event.id = id;
+    event.timeMs = timeMs;
+    event.payload = payload;
+    result.decoded = row->decode(event, state, result.events);
+    return result;
+}
+
+std::size_t feedEventNoise(std::span<const EventDecoderRow> table) {
+    std::uint32_t seed = 0x9E3779B9;
+    const auto next = [&] {
+        seed ^= seed << 13;
+        seed ^= seed >> 17;
+        seed ^= seed << 5;
+        return seed;
+    };
+    std::size_t taken = 0;
+    DecodeState state;
+    for (const EventDecoderRow& row : table) {
+        for (std::size_t length = 0; length <= 40; ++length) {
+            for (int round = 0; round < 64; ++round) {
+                Bytes payload(length);
+                // Small values now and then, where the rows' arguments lie.
+                for (std::uint8_t& b : payload)
+                    b = static_cast<std::uint8_t>(round % 2 == 0 ? next() : next() % 8);
+                const Decoded d = decodeEvent(table, row.id, payload, state, kTimeMs + 10U * taken);
+                if (!d.decoded) continue;
+                ++taken;
+                for (const MetricOut& e : d.events) {
+                    const MetricKind* kind = findMetricKind(e.metricID);
+                    if (kind == nullptr || !kind->decodable()) {
+                        ADD_FAILURE() << row.name << " wrote an unknown kind " << e.metricID;
+                        continue;
+                    }
+                    const auto decodedEvent = kind->decode(e.payload);
+                    EXPECT_TRUE(std::holds_alternative<Dict>(decodedEvent))
+                        << row.name << ": " << kind->messageClass;
+                }
+            }
+        }
+    }
+    return taken;
+}
+
+std::vector<CapturedEvent> captureEvents(const std::string& file,
+                                         std::span<const std::uint16_t> ids) {
+    std::ifstream in(sharedDiag() / "captures" / file, std::ios::binary);
+    const Bytes raw{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+    std::vector<CapturedEvent> events;
+    Deframer deframer;
+    deframer.feed(raw, [&](std::span<const std::uint8_t> packet) {
+        if (const auto multiSim = readMultiSim(packet)) packet = multiSim->inner;
+        if (packet.empty() || packet[0] != 0x60) return;
+        static_cast<void>(readEventReport(packet, [&](const ReportedEvent& event) {
+            if (std::find(ids.begin(), ids.end(), event.id) != ids.end())
+                events.push_back({event.id, Bytes(event.payload.begin(), event.payload.end())});
+        }));
+    });
+    return events;
+}
+
 }  // namespace pyx::diag::test

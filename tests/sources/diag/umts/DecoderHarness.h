@@ -62,4 +62,26 @@ struct CapturedPacket {
 [[nodiscard]] std::vector<CapturedPacket> capturePackets(const std::string& file,
                                                          std::span<const std::uint16_t> codes);
 
+// Event rows (eventDecoders()), as the log rows above: the row of table for an event id, or
+// nullptr; an event's payload run through it (at kTimeMs, or at timeMs), with state carried by
+// the caller; and pseudo-random payloads of every length up to 40 bytes through every row,
+// with one state carried throughout (none may read past its payload, and whatever a row writes
+// must decode as its kind's class), returning how many the rows took.
+[[nodiscard]] const EventDecoderRow* eventRowFor(std::span<const EventDecoderRow> table,
+                                                 std::uint16_t id);
+[[nodiscard]] Decoded decodeEvent(std::span<const EventDecoderRow> table, std::uint16_t id,
+                                  std::span<const std::uint8_t> payload, DecodeState& state,
+                                  std::uint64_t timeMs = kTimeMs);
+std::size_t feedEventNoise(std::span<const EventDecoderRow> table);
+
+// The events of any of ids in the event reports (command 0x60) of a capture, in stream order:
+// each event's id (b0-11 of its word) and payload (none, 1 or 2 bytes as b13-14 say, or
+// length-prefixed), after a 2-byte (b15 set) or 8-byte timestamp.
+struct CapturedEvent {
+    std::uint16_t id = 0;
+    Bytes payload;
+};
+[[nodiscard]] std::vector<CapturedEvent> captureEvents(const std::string& file,
+                                                       std::span<const std::uint16_t> ids);
+
 }  // namespace pyx::diag::test
