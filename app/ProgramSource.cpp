@@ -10,7 +10,7 @@ namespace pyx {
 
 void SourceArgs::addTo(CLI::App& app) {
     app.add_option("--source", source,
-                   "Where events come from: sim, modem, modem:N or replay:FILE (see below)")
+                   "Where events come from: " + sources::sourceFormNames() + " (see below)")
         ->type_name("SOURCE")
         ->capture_default_str();
     app.add_option("--seed", seed, "Seed of the simulated baseband's drive")->capture_default_str();

@@ -77,6 +77,8 @@ struct RecordedSource {
                                           const SourceOptions& options,
                                           const RecordOptions& record);
 
+// Every --source form, "sim, modem, modem:N or replay:FILE", for the option's description.
+[[nodiscard]] std::string sourceFormNames();
 // The help text that explains the sources, with an example each; shared by pyxon and pyxonctl.
 [[nodiscard]] std::string_view sourceHelp();
 // The help text that explains --record and --append, with examples; shared likewise.
