@@ -5,6 +5,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 #include <span>
 
 #include "core/Value.h"
@@ -38,15 +39,31 @@ class Deframer {
     // the end of a capture these are a final frame cut short: normal, counted, not an error.
     [[nodiscard]] std::size_t pending() const { return pending_.size(); }
     // Forgets a frame begun (a port reopened).
-    void reset() { pending_.clear(); }
+    void reset() {
+        pending_.clear();
+        escaped_ = false;
+        overlong_ = false;
+    }
     [[nodiscard]] const Counts& counts() const { return counts_; }
 
   private:
+    static constexpr std::uint8_t kFlag = 0x7E;
+    static constexpr std::uint8_t kEscape = 0x7D;
+    // The longest frame taken (unescaped, CRC included): a log packet's u16 lengths, a
+    // multi-SIM wrapper and the CRC fit well inside. Longer ones are bad frames, and a stream
+    // of noise without a flag does not grow pending_ past it.
+    static constexpr std::size_t kMaxFrame = std::size_t{1} << 17;
+
+    // Appends the unescaped bytes of segment (no flag inside) to pending_.
+    void append(std::span<const std::uint8_t> segment);
     // Ends the frame in pending_ (unescaped): checks and strips the CRC; true when good.
     bool endFrame();
+    // Counts a whole unescaped frame; its packet (CRC removed) when the CRC holds.
+    std::optional<std::span<const std::uint8_t>> checkFrame(std::span<const std::uint8_t> frame);
 
-    Bytes pending_;  // the unescaped bytes of the frame being read
-    bool escaped_ = false;
+    Bytes pending_;          // the unescaped bytes of the frame being read
+    bool escaped_ = false;   // the last byte read was an escape
+    bool overlong_ = false;  // the frame being read passed kMaxFrame: dropped up to its flag
     Counts counts_;
 };
 

@@ -33,7 +33,8 @@ struct StreamStats {
     std::map<std::uint16_t, Counts> events;
     // Frames of other commands by command byte (responses, F3 messages, secure logs...).
     std::map<std::uint8_t, std::uint64_t> otherCommands;
-    // Log packets whose header does not fit (declared length past the frame...).
+    // Log packets whose header does not fit (declared length past the frame...), event
+    // reports whose events overrun their length, multi-SIM frames too short for their header.
     std::uint64_t malformed = 0;
     // Multi-SIM (0x98) frames by subscription id; only the first one seen is decoded.
     std::map<std::uint32_t, std::uint64_t> subscriptions;
@@ -62,7 +63,10 @@ class DiagStream {
     // (command responses), with its packet (unescaped, CRC removed).
     using ResponseSink = std::function<void(std::span<const std::uint8_t> packet)>;
 
-    explicit DiagStream(Options options = {});
+    // (Two constructors: g++ takes no default argument of a nested class with member
+    // initialisers inside the enclosing class.)
+    DiagStream();
+    explicit DiagStream(Options options);
 
     void feed(std::span<const std::uint8_t> bytes, const EventSink& onEvents,
               const ResponseSink& onResponse = {});
@@ -77,12 +81,45 @@ class DiagStream {
     [[nodiscard]] static std::span<const std::uint16_t> decodedLogCodes();
 
   private:
-    // ... (the implementation's own)
+    void onPacket(std::span<const std::uint8_t> packet, const EventSink& onEvents,
+                  const ResponseSink& onResponse);
+    // The packet of a frame, or the inner packet of a multi-SIM frame of the first subscription.
+    void dispatch(std::span<const std::uint8_t> packet, const EventSink& onEvents,
+                  const ResponseSink& onResponse);
+    void logPacket(std::span<const std::uint8_t> packet, const EventSink& onEvents);
+    void eventReport(std::span<const std::uint8_t> packet, const EventSink& onEvents);
+    void decodeEvent(const EventReport& event, const EventSink& onEvents);
+    // The time messages carry for a packet whose own time (ms since 1970) is modemMs.
+    [[nodiscard]] std::uint64_t messageTime(std::uint64_t modemMs, bool clockSet) const;
+    [[nodiscard]] StreamStats::Counts& logCounts(std::uint16_t code, int version);
+
+    Options options_;
+    Deframer deframer_;
+    DecodeState state_;
+    StreamStats stats_;
+    std::optional<std::uint32_t> subscription_;  // the first one seen: the one decoded
+    std::uint64_t lastModemMs_ = 0;  // the last full modem time (for truncated event times)
+    DecodedPacket decoded_;          // reused: its events' buffer stays allocated
+    // The last (code, version) counted, most packets being of a few kinds.
+    std::uint32_t lastLogKey_ = ~std::uint32_t{0};
+    StreamStats::Counts* lastLogCounts_ = nullptr;
 };
 
 // The modem's 1.25 ms ticks since 1980-01-06 (upper 48 bits of a log timestamp) as ms since
 // 1970; 0 for a timestamp of 0.
 [[nodiscard]] std::uint64_t modemTimeMs(std::uint64_t timestamp);
+
+// The fields of a log packet (0x10) whose declared lengths match its size (timeMs left 0), or
+// nothing; the payload points into packet.
+[[nodiscard]] std::optional<LogPacket> readLogPacket(std::span<const std::uint8_t> packet);
+
+// The subscription and inner packet of a multi-SIM packet (98 01 00 00, u32 subscription, a
+// packet of at least one byte), or nothing.
+struct MultiSimPacket {
+    std::uint32_t subscription = 0;
+    std::span<const std::uint8_t> inner;
+};
+[[nodiscard]] std::optional<MultiSimPacket> readMultiSim(std::span<const std::uint8_t> packet);
 
 // Packets as a modem writes them (for the fake modem in the tests, the benchmarks and the fuzz
 // seeds): a log packet (0x10, lengths, code, timestamp, payload), an event report (0x60) of
@@ -92,7 +129,9 @@ class DiagStream {
 struct WrittenEvent {
     std::uint16_t id = 0;
     std::uint64_t timestamp = 0;
-    Bytes payload;  // 0, 1 or 2 bytes inline, longer ones length-prefixed
+    Bytes payload;  // 0, 1 or 2 bytes inline, longer ones (up to 255) length-prefixed
+    // Written in the 2-byte truncated form (bits 16-31 of timestamp) instead of the whole u64.
+    bool truncatedTime = false;
 };
 [[nodiscard]] Bytes eventReport(std::span<const WrittenEvent> events);
 [[nodiscard]] Bytes multiSim(std::uint32_t subscription, std::span<const std::uint8_t> inner);

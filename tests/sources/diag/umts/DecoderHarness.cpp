@@ -8,6 +8,8 @@
 #include <variant>
 
 #include "metrics/MetricCatalogue.h"
+#include "sources/diag/frame/Hdlc.h"
+#include "sources/diag/stream/DiagStream.h"
 #include "tests/sources/diag/support/DiagVectors.h"
 
 namespace pyx::diag::test {
@@ -125,21 +127,6 @@ const Dict& element(const Dict& dict, const std::string& list, std::size_t index
     return v->asArray()[index].asDict();
 }
 
-namespace {
-
-// CRC-16/X-25 of a frame's unescaped bytes.
-std::uint16_t crc16(std::span<const std::uint8_t> bytes) {
-    std::uint16_t crc = 0xFFFF;
-    for (const std::uint8_t b : bytes) {
-        crc ^= b;
-        for (int i = 0; i < 8; ++i)
-            crc = static_cast<std::uint16_t>(crc & 1 ? (crc >> 1) ^ 0x8408 : crc >> 1);
-    }
-    return static_cast<std::uint16_t>(~crc);
-}
-
-}  // namespace
-
 std::vector<Bytes> capturePayloads(const std::string& file, std::uint16_t code) {
     std::vector<Bytes> payloads;
     for (CapturedPacket& packet : capturePackets(file, std::span(&code, 1)))
@@ -152,28 +139,14 @@ std::vector<CapturedPacket> capturePackets(const std::string& file,
     std::ifstream in(sharedDiag() / "captures" / file, std::ios::binary);
     const Bytes raw{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
     std::vector<CapturedPacket> packets;
-    Bytes frame;
-    for (std::size_t i = 0; i < raw.size(); ++i) {
-        if (raw[i] != 0x7E) {
-            if (raw[i] == 0x7D && i + 1 < raw.size())
-                frame.push_back(static_cast<std::uint8_t>(raw[++i] ^ 0x20));
-            else
-                frame.push_back(raw[i]);
-            continue;
-        }
-        std::span<const std::uint8_t> body(frame);
-        if (body.size() >= 3 && crc16(body.first(body.size() - 2)) ==
-                                    (body[body.size() - 2] | body[body.size() - 1] << 8)) {
-            body = body.first(body.size() - 2);
-            if (body[0] == 0x98 && body.size() > 8) body = body.subspan(8);
-            const auto code =
-                static_cast<std::uint16_t>(body.size() >= 16 ? body[6] | body[7] << 8 : 0);
-            if (body[0] == 0x10 && body.size() >= 16 &&
-                std::find(codes.begin(), codes.end(), code) != codes.end())
-                packets.push_back({code, Bytes(body.begin() + 16, body.end())});
-        }
-        frame.clear();
-    }
+    // Frames with a bad CRC are skipped; log packets of every subscription are taken.
+    Deframer deframer;
+    deframer.feed(raw, [&](std::span<const std::uint8_t> packet) {
+        if (const auto multiSim = readMultiSim(packet)) packet = multiSim->inner;
+        const auto log = readLogPacket(packet);
+        if (log && std::find(codes.begin(), codes.end(), log->code) != codes.end())
+            packets.push_back({log->code, Bytes(log->payload.begin(), log->payload.end())});
+    });
     return packets;
 }
 
