@@ -56,6 +56,7 @@ TEST_F(DebianPackage, HoldsTheProgramsTheBundleTheDesktopFilesAndTheManualPages)
         "usr/bin/pyxonctl",
         "usr/share/applications/" + kAppID + ".desktop",
         "usr/share/icons/hicolor/scalable/apps/" + kAppID + ".svg",
+        "usr/share/doc/pyxon/examples/udev/70-pyxon-diag-mm-ignore.rules",
         "usr/share/man/man1/pyxon.1.gz",
         "usr/share/man/man1/pyxonctl.1.gz",
         "usr/share/metainfo/" + kAppID + ".metainfo.xml",
