@@ -16,11 +16,12 @@ void SourceArgs::addTo(CLI::App& app) {
     app.add_option("--seed", seed, "Seed of the simulated baseband's drive")->capture_default_str();
     app.add_option("--speed", speed,
                    "Speed factor: the simulated baseband's events come this many times as often "
-                   "(> 0); a replay divides the recorded timing by it (0 = as fast as the store "
-                   "takes them)")
+                   "(> 0); a replay or a diag capture divides the recorded timing by it (0 = as "
+                   "fast as the store takes them)")
         ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
-    app.add_flag("--loop", loop, "Replay: start again at the end of the recording");
+    app.add_flag("--loop", loop,
+                 "Replay or diag capture: start again at the end of the recording or capture");
     CLI::Option* recordOption =
         app.add_option("--record", record,
                        "Keep every event of this run in FILE (.pyxrec), raw and in order")
@@ -33,6 +34,11 @@ void SourceArgs::addTo(CLI::App& app) {
         ->type_name("[HOST:PORT]")
         ->expected(0, 1)
         ->default_str("");
+    app.add_option("--qmdl", qmdl,
+                   "With a live diag source (diag, diag:PORT): keep the raw stream the port sends "
+                   "in FILE, a .qmdl that --source diag:FILE plays again (e.g. --source diag "
+                   "--qmdl drive.qmdl)")
+        ->type_name("FILE");
 }
 
 ProgramSource::ProgramSource(std::shared_ptr<velk::client::Transport> transport,
@@ -69,6 +75,15 @@ ProgramSource openProgramSource(const SourceArgs& args, const std::string& progr
     options.speed = args.speed;
     options.loop = args.loop;
     options.onEnd = std::move(onEnd);
+    if (args.qmdl) {
+        if (!sources::isLiveDiag(options.choice))
+            throw sources::SourceError("--qmdl " + *args.qmdl +
+                                       ": only with a live diag source (--source diag or "
+                                       "diag:PORT), not with --source " +
+                                       options.choice.text);
+        if (args.qmdl->empty()) throw sources::SourceError("--qmdl: names no file");
+        options.qmdlFile = *args.qmdl;
+    }
     std::shared_ptr<velk::client::Transport> transport = sources::makeTransport(options);
     std::shared_ptr<recordings::RecordingWriter> recording;
     if (args.record) {

@@ -26,31 +26,44 @@ class SourceError : public std::invalid_argument {
 
 // The source a --source text names.
 struct SourceChoice {
-    enum class Kind { Sim, Modem, Replay };
+    enum class Kind { Sim, Modem, Replay, Diag };
     Kind kind = Kind::Sim;
     // modem:N, the modem whose object path ends in /Modem/N; absent for the first modem.
     std::optional<std::uint32_t> modemIndex;
-    // replay:FILE, the recording to play.
+    // replay:FILE, the recording to play; diag:PATH, the DIAG port or capture file (empty for
+    // diag alone: the port is found by its USB interface).
     std::string file;
+    // diag:FILE naming a regular file: a capture to play rather than a live port.
+    bool capture = false;
     // The text as given ("sim", "modem:0", "replay:drive.pyxrec"), for logs and recordings.
     std::string text = "sim";
 };
 
-// "sim", "modem", "modem:N" or "replay:FILE". Throws SourceError.
+// "sim", "modem", "modem:N", "replay:FILE", "diag", "diag:PORT" or "diag:FILE" (the
+// sources/SourceTable.cpp rows). Throws SourceError.
 [[nodiscard]] SourceChoice parseSource(std::string_view text);
 
 struct SourceOptions {
     SourceChoice choice;
     std::uint64_t seed = 1;  // sim
-    double speed = 1.0;      // sim: time runs this much faster; replay: 0 = as fast as taken
-    bool loop = false;       // replay: start again at the end
-    // replay: events handed out and not yet taken in by the store, so that a fast replay
-    // waits for it; none: what waits on the client's serial queue and the main queue.
+    // sim: time runs this much faster; replay and a diag capture: 0 = as fast as taken
+    double speed = 1.0;
+    bool loop = false;  // replay and a diag capture: start again at the end
+    // replay and a diag capture: events handed out and not yet taken in by the store, so that a
+    // fast replay waits for it; none: what waits on the client's serial queue and the main queue.
     std::function<std::size_t()> backlog;
     // replay: called once, on the replay's thread, when the replay is over: a recording
     // without loop has ended, the recording holds no events, or it is damaged (damaged: true).
+    // A diag capture likewise: its end without loop, or a loop over nothing it decodes.
     std::function<void(bool damaged)> onEnd;
+    // diag, live: where to keep the raw byte stream the port sends (a .qmdl); empty: nowhere.
+    std::string qmdlFile;
 };
+
+// Whether choice is a live DIAG port (diag or diag:PORT, not a capture file).
+[[nodiscard]] inline bool isLiveDiag(const SourceChoice& choice) {
+    return choice.kind == SourceChoice::Kind::Diag && !choice.capture;
+}
 
 // The transport of a source. Throws SourceError for options that do not fit the source
 // (a speed the simulated baseband refuses, a replay file that cannot be opened...), with one

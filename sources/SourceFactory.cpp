@@ -37,7 +37,8 @@ RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
     writer.session.source = options.choice.text;
     if (options.choice.kind == SourceChoice::Kind::Sim)
         writer.session.seed = static_cast<std::int64_t>(options.seed);
-    if (options.choice.kind != SourceChoice::Kind::Modem) writer.session.speed = options.speed;
+    if (options.choice.kind != SourceChoice::Kind::Modem && !isLiveDiag(options.choice))
+        writer.session.speed = options.speed;
     char host[HOST_NAME_MAX + 1] = {};
     if (gethostname(host, sizeof host - 1) == 0) writer.session.host = host;
     try {

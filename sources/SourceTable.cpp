@@ -1,6 +1,10 @@
 #include "sources/SourceTable.h"
 
+#include <sys/stat.h>
+
+#include <cerrno>
 #include <charconv>
+#include <cstring>
 #include <stdexcept>
 #include <string>
 #include <utility>
@@ -8,6 +12,7 @@
 #include "baseband/VelkWrapper.h"
 #include "core/MainQueue.h"
 #include "recordings/RecordingError.h"
+#include "sources/diag/DiagTransport.h"
 #include "sources/modem/ModemManagerBaseband.h"
 #include "sources/replay/ReplayTransport.h"
 #include "sources/sim/SimulatedBaseband.h"
@@ -97,6 +102,70 @@ std::shared_ptr<velk::client::Transport> replayMake(const SourceOptions& options
     }
 }
 
+// --- diag ---
+
+constexpr SourceForm kDiagForms[] = {
+    {"diag", ""},
+    {"diag:PORT", " (a tty or a character device, as /dev/ttyUSB0)"},
+    {"diag:FILE", " (a capture of the port: .qmdl, .mi2log, .bin)"}};
+
+bool diagClaims(std::string_view text) {
+    return text == "diag" || text.starts_with("diag:");
+}
+
+// diag:PATH by what PATH is: a character device is a port, a regular file a capture. A path
+// under /dev that is not there is a port not there yet (a modem still starting, or not yet
+// plugged in), which the link waits for; any other missing path is refused.
+void diagParse(std::string_view text, SourceChoice& choice) {
+    if (text == "diag") return;
+    const std::string path(text.substr(5));
+    const std::string where = "--source " + std::string(text) + ": ";
+    if (path.empty())
+        throw SourceError(
+            "--source diag: names no port or file; example: diag:/dev/ttyUSB0 or "
+            "diag:drive.qmdl");
+    choice.file = path;
+    struct stat info {};
+    if (::stat(path.c_str(), &info) != 0) {
+        const int error = errno;
+        if (error == ENOENT && path.starts_with("/dev/")) return;  // a port to wait for
+        if (error == ENOENT)
+            throw SourceError(where +
+                              "no such file (a capture must exist; a port under /dev/ that is not "
+                              "there yet is waited for)");
+        throw SourceError(where + std::strerror(error));
+    }
+    if (S_ISCHR(info.st_mode)) return;
+    if (S_ISREG(info.st_mode)) {
+        choice.capture = true;
+        return;
+    }
+    throw SourceError(where +
+                      (S_ISDIR(info.st_mode) ? "is a directory" : "is neither a port nor a file") +
+                      "; " + expectedForms());
+}
+
+std::shared_ptr<velk::client::Transport> diagMake(const SourceOptions& options) {
+    diag::DiagTransport::Options diagOptions;
+    if (options.choice.capture) {
+        diagOptions.capture = options.choice.file;
+        diagOptions.speed = options.speed;
+        diagOptions.loop = options.loop;
+        diagOptions.onEnd = options.onEnd;
+        diagOptions.backlog = options.backlog ? options.backlog : storeBacklog;
+    } else {
+        diagOptions.link.path = options.choice.file;
+        diagOptions.link.qmdlFile = options.qmdlFile;
+    }
+    try {
+        return std::make_shared<diag::DiagTransport>(std::move(diagOptions));
+    } catch (const diag::DiagCaptureError& e) {
+        throw SourceError(std::string("--source diag:") + e.what());
+    } catch (const std::invalid_argument& e) {
+        throw SourceError(e.what());
+    }
+}
+
 constexpr SourceRow kRows[] = {
     {SourceChoice::Kind::Sim, kSimForms,
      "  sim            the built-in simulated baseband (default); --seed and --speed apply\n"
@@ -113,6 +182,18 @@ constexpr SourceRow kRows[] = {
      "                 takes it) and --loop apply\n"
      "                 example: --source replay:drive.pyxrec --speed 10\n",
      replayClaims, replayParse, replayMake},
+    {SourceChoice::Kind::Diag, kDiagForms,
+     "  diag           a Qualcomm modem's diagnostic (DIAG) port, found by its USB\n"
+     "                 interface; --qmdl FILE keeps the raw stream it sends\n"
+     "                 example: --source diag --qmdl drive.qmdl\n"
+     "  diag:PORT      that port: a tty or a character device; a port under /dev that is\n"
+     "                 not there yet (the modem still starting) is waited for\n"
+     "                 example: --source diag:/dev/ttyUSB0\n"
+     "  diag:FILE      a capture of the port's raw stream (.qmdl, .mi2log, .bin), played\n"
+     "                 by the modem's own times; --speed (0 = as fast as the store takes\n"
+     "                 it), --loop and --record apply, as to a replay\n"
+     "                 example: --source diag:drive.qmdl --speed 0\n",
+     diagClaims, diagParse, diagMake},
 };
 
 // Every form of every row, in order.
