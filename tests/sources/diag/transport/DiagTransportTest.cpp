@@ -20,6 +20,7 @@
 #include "sources/Source.h"
 #include "sources/diag/decode/ByteReader.h"
 #include "tests/recordings/TempDir.h"
+#include "tests/sources/diag/support/FakeDiagModem.h"
 #include "tests/sources/diag/transport/WcdmaCapture.h"
 #include "tests/sources/diag/umts/DecoderHarness.h"
 
@@ -244,7 +245,7 @@ TEST(DiagCapture, NoiseAndABadFrameAreCountedAndSkipped) {
     const Bytes good = wcdmaCapture(cells(2, 100));
     bytes.insert(bytes.end(), good.begin(), good.end());
     Bytes bad = frame(logPacket(0x4127, logTimestamp(1700000001000ULL),
-                                wcdmaCellIdPayload({1700000001000ULL, 10663, 9})));
+                                wcdmaCellPayload({1700000001000ULL, 10663, 9})));
     bad[20] ^= 0x01;  // its CRC no longer holds
     bytes.insert(bytes.end(), bad.begin(), bad.end());
     const Bytes more = wcdmaCapture(std::vector<CapturedCell>{{1700000002000ULL, 10663, 3}});
@@ -342,6 +343,96 @@ TEST(DiagCapture, ThroughTheSourceFactoryAsTheProgramsOpenIt) {
     ASSERT_TRUE(collector.waitForEnd());
     transport->stopEvents();
     EXPECT_EQ(collector.pscs(), numbered(1, 6));
+}
+
+// The lines a live link says, waited for.
+class Lines {
+  public:
+    std::function<void(std::string_view)> sink() {
+        return [this](std::string_view line) {
+            const std::lock_guard lock(mutex_);
+            lines_.emplace_back(line);
+            changed_.notify_all();
+        };
+    }
+    bool waitFor(const std::string& part) {
+        std::unique_lock lock(mutex_);
+        return changed_.wait_for(lock, std::chrono::seconds(60), [&] {
+            for (const std::string& line : lines_)
+                if (line.find(part) != std::string::npos) return true;
+            return false;
+        });
+    }
+    std::vector<std::string> all() const {
+        const std::lock_guard lock(mutex_);
+        return lines_;
+    }
+
+  private:
+    mutable std::mutex mutex_;
+    std::condition_variable changed_;
+    std::vector<std::string> lines_;
+};
+
+TEST(DiagLive, TheFakeModemsPacketsComeAsEventsAndTheSummaryIsSaidAtStop) {
+    const CapturedLines faults(systemLogSink());
+    FakeDiagModem modem;
+    Lines lines;
+    DiagTransport::Options options;
+    options.link.path = modem.path();
+    options.link.onLine = lines.sink();
+    DiagTransport transport(std::move(options));
+    ASSERT_TRUE(
+        transport.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr)
+            .ok());
+    Collector collector;
+    transport.startEvents(collector.sink());
+    ASSERT_TRUE(lines.waitFor("DIAG logging on")) << ::testing::PrintToString(lines.all());
+    for (std::uint32_t psc = 1; psc <= 3; ++psc) {
+        const CapturedCell cell{1700000000000ULL + psc * 100, 10663, psc};
+        modem.writePacket(logPacket(0x4127, logTimestamp(cell.timeMs), wcdmaCellPayload(cell)));
+    }
+    ASSERT_TRUE(collector.waitForCount(3));
+    transport.stopEvents();
+    EXPECT_EQ(collector.pscs(), numbered(1, 3));
+    for (const std::string& stream : collector.streams()) EXPECT_EQ(stream, velk::kEventMetric);
+    EXPECT_TRUE(faults.contains("diag " + modem.path() +
+                                ": 3 packets decoded, 0 not decoded, 0 bad frames"))
+        << ::testing::PrintToString(faults.lines());
+}
+
+TEST(DiagLive, TheQmdlKeptFromThePortPlaysBackAsACapture) {
+    const TempDir dir;
+    const std::string kept = dir.file("kept.qmdl");
+    FakeDiagModem modem;
+    {
+        sources::SourceOptions options;
+        options.choice = sources::parseSource("diag:" + modem.path());
+        ASSERT_TRUE(sources::isLiveDiag(options.choice));
+        options.qmdlFile = kept;
+        const auto transport = sources::makeTransport(options);
+        transport->performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+        Collector collector;
+        transport->startEvents(collector.sink());
+        ASSERT_TRUE(modem.waitForRequests(
+            [](const std::vector<Bytes>& requests) { return requests.size() > 3; },
+            std::chrono::seconds(60)));
+        for (std::uint32_t psc = 7; psc <= 8; ++psc) {
+            const CapturedCell cell{1700000000000ULL + psc * 100, 10663, psc};
+            modem.writePacket(logPacket(0x4127, logTimestamp(cell.timeMs), wcdmaCellPayload(cell)));
+        }
+        ASSERT_TRUE(collector.waitForCount(2));
+        transport->stopEvents();
+        EXPECT_EQ(collector.pscs(), numbered(7, 8));
+    }
+
+    Collector collector;
+    DiagTransport playback(captureOptions(kept, 0, collector));
+    playback.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+    playback.startEvents(collector.sink());
+    ASSERT_TRUE(collector.waitForEnd());
+    playback.stopEvents();
+    EXPECT_EQ(collector.pscs(), numbered(7, 8));
 }
 
 }  // namespace

@@ -27,7 +27,7 @@ std::uint64_t logTimestamp(std::uint64_t timeMs) {
     return ticks << 16;
 }
 
-Bytes wcdmaCellIdPayload(const CapturedCell& cell) {
+Bytes wcdmaCellPayload(const CapturedCell& cell) {
     Bytes payload(32, 0);
     putU32(payload, 0, cell.dlUarfcn - 950);  // UL UARFCN
     putU32(payload, 4, cell.dlUarfcn);
@@ -44,7 +44,7 @@ Bytes wcdmaCellIdPayload(const CapturedCell& cell) {
 Bytes wcdmaCapture(std::span<const CapturedCell> cells) {
     Bytes out;
     for (const CapturedCell& cell : cells) {
-        const Bytes payload = wcdmaCellIdPayload(cell);
+        const Bytes payload = wcdmaCellPayload(cell);
         appendFrame(logPacket(0x4127, logTimestamp(cell.timeMs), payload), out);
     }
     return out;

@@ -25,7 +25,7 @@ struct CapturedCell {
 };
 
 // The 32-byte payload of a WCDMA cell ID packet (MCC 001, MNC 01, LAC 0x1234).
-[[nodiscard]] Bytes wcdmaCellIdPayload(const CapturedCell& cell);
+[[nodiscard]] Bytes wcdmaCellPayload(const CapturedCell& cell);
 // The cells' log packets, each framed, in order.
 [[nodiscard]] Bytes wcdmaCapture(std::span<const CapturedCell> cells);
 // Writes bytes to path (replacing it).
