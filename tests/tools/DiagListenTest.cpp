@@ -105,6 +105,21 @@ TEST(DiagListen, PipedIntoScreenShowsTheServingCell) {
     EXPECT_TRUE(shows("psc", "4")) << run.out;  // the last cell
 }
 
+TEST(DiagListen, RecordKeepsTheCapturesEventsAsAReplaysSession) {
+    const TempDir dir;
+    const std::string file = writeCapture(dir, 5);
+    const std::string recording = dir.file("drive.pyxrec");
+    const ProgramRun run =
+        shell("\"$PYXONCTL\" listen --source 'diag:" + file + "' --speed 0 --record '" + recording +
+              "' > /dev/null && \"$PYXONCTL\" info '" + recording + "'");
+    EXPECT_EQ(run.exitCode, 0) << run.err;
+    const Json info = Json::parse(run.out);
+    EXPECT_EQ(info["events"], 5);
+    EXPECT_EQ(info["kinds"]["0x3C300C"], 5);
+    EXPECT_EQ(info["sessions"][0]["source"], "diag:" + file);
+    EXPECT_EQ(info["sessions"][0]["speed"], 0.0);
+}
+
 TEST(DiagListen, QmdlWithoutALiveDiagSourceIsOneLine) {
     const TempDir dir;
     const std::string file = writeCapture(dir, 1);
