@@ -76,13 +76,8 @@ ProgramSource openProgramSource(const SourceArgs& args, const std::string& progr
     options.loop = args.loop;
     options.onEnd = std::move(onEnd);
     if (args.qmdl) {
-        if (!sources::isLiveDiag(options.choice))
-            throw sources::SourceError("--qmdl " + *args.qmdl +
-                                       ": only with a live diag source (--source diag or "
-                                       "diag:PORT), not with --source " +
-                                       options.choice.text);
         if (args.qmdl->empty()) throw sources::SourceError("--qmdl: names no file");
-        options.qmdlFile = *args.qmdl;
+        options.qmdlFile = *args.qmdl;  // makeTransport refuses it but for a live diag source
     }
     std::shared_ptr<velk::client::Transport> transport = sources::makeTransport(options);
     std::shared_ptr<recordings::RecordingWriter> recording;

@@ -66,8 +66,8 @@ struct SourceOptions {
 }
 
 // The transport of a source. Throws SourceError for options that do not fit the source
-// (a speed the simulated baseband refuses, a replay file that cannot be opened...), with one
-// line that names what is wrong.
+// (a speed the simulated baseband refuses, a replay file that cannot be opened, a qmdlFile for
+// a source other than a live diag port...), with one line that names what is wrong.
 [[nodiscard]] std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& options);
 
 // --record FILE [--append]: where the events of the run are kept.

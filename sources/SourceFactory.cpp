@@ -23,6 +23,11 @@ SourceChoice parseSource(std::string_view text) {
 }
 
 std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& options) {
+    if (!options.qmdlFile.empty() && !isLiveDiag(options.choice))
+        throw SourceError("--qmdl " + options.qmdlFile +
+                          ": only with a live diag source (--source diag or diag:PORT), not "
+                          "with --source " +
+                          options.choice.text);
     for (const SourceRow& row : sourceTable())
         if (row.kind == options.choice.kind) return row.make(options);
     throw SourceError("--source " + options.choice.text + ": unknown source");

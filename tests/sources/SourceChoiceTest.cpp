@@ -162,6 +162,27 @@ TEST(SourceChoice, DiagCaptureThatIsADirectoryIsRefusedByTheFactoryToo) {
     }
 }
 
+TEST(SourceChoice, QmdlIsForALiveDiagSourceOnly) {
+    const Folder folder;
+    const std::string capture = folder.file("drive.qmdl");
+    std::ofstream(capture) << "~";
+    for (const std::string& text :
+         {std::string("sim"), std::string("replay:x.pyxrec"), "diag:" + capture}) {
+        pyx::sources::SourceOptions options;
+        options.choice = parseSource(text);
+        options.qmdlFile = "kept.qmdl";
+        try {
+            static_cast<void>(pyx::sources::makeTransport(options));
+            ADD_FAILURE() << text << " took --qmdl";
+        } catch (const SourceError& e) {
+            EXPECT_EQ(std::string(e.what()),
+                      "--qmdl kept.qmdl: only with a live diag source (--source diag or "
+                      "diag:PORT), not with --source " +
+                          text);
+        }
+    }
+}
+
 TEST(SourceChoice, HelpGivesEverySourceFormWithAnExample) {
     const std::string help(pyx::sources::sourceHelp());
     EXPECT_EQ(help.find("Sources (--source):\n  sim            the built-in"), 0U);
