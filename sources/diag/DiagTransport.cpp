@@ -157,8 +157,9 @@ void DiagTransport::stopThread() {
     thread_.join();
     // A capture stopped before its end: what it came to so far (the live link says its own).
     if (link_ || finished() || playback_.handedOut == 0) return;
-    systemFault(
-        format("diag %s: stopped: %s", options_.capture.c_str(), summaryText(stats()).c_str()));
+    systemFault(format("diag %s: stopped after %s; read so far: %s", options_.capture.c_str(),
+                       counted(playback_.handedOut, "packet", "packets").c_str(),
+                       summaryText(stats()).c_str()));
 }
 
 bool DiagTransport::finished() const {

@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <chrono>
 #include <condition_variable>
 #include <filesystem>
@@ -170,6 +171,54 @@ TEST(DiagCapture, AtSpeedOneThePacketsComeInTheirOrder) {
     ASSERT_TRUE(collector.waitForEnd());
     transport.stopEvents();
     EXPECT_EQ(collector.pscs(), numbered(1, 4));
+}
+
+// The store's backlog as the transport sees it: empty until `allowed` events were handed out,
+// full after, so that the capture waits there.
+class Store {
+  public:
+    explicit Store(const Collector& collector) : collector_(collector) {}
+    std::function<std::size_t()> backlog() {
+        return [this] {
+            return collector_.pscs().size() < allowed.load() ? std::size_t{0} : std::size_t{100000};
+        };
+    }
+    std::atomic<std::size_t> allowed{0};
+
+  private:
+    const Collector& collector_;
+};
+
+TEST(DiagCapture, WaitsForTheStoreAndARestartGoesOnWhereItStopped) {
+    const CapturedLines faults(systemLogSink());
+    const TempDir dir;
+    const std::string file = dir.file("drive.qmdl");
+    writeBytes(file, wcdmaCapture(cells(8, 100)));
+
+    Collector collector;
+    Store store(collector);
+    store.allowed = 3;
+    DiagTransport::Options options = captureOptions(file, 0, collector);
+    options.backlog = store.backlog();
+    DiagTransport transport(std::move(options));
+    transport.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+    transport.startEvents(collector.sink());
+    ASSERT_TRUE(collector.waitForCount(3));
+    transport.stopEvents();  // while it waits for the store
+    EXPECT_EQ(collector.pscs(), numbered(1, 3));
+    EXPECT_FALSE(transport.finished());
+    EXPECT_TRUE(faults.contains(
+        "diag " + file +
+        ": stopped after 3 packets; read so far: 8 packets decoded, 0 not decoded, 0 "
+        "bad frames"))
+        << ::testing::PrintToString(faults.lines());
+
+    store.allowed = 100;
+    transport.startEvents(collector.sink());
+    ASSERT_TRUE(collector.waitForEnd());
+    transport.stopEvents();
+    EXPECT_EQ(collector.pscs(), numbered(1, 8));
+    EXPECT_EQ(collector.ends(), 1);
 }
 
 TEST(DiagCapture, PacketsWithoutTheModemsClockComeToo) {
