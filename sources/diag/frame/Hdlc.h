@@ -24,10 +24,12 @@ void appendFrame(std::span<const std::uint8_t> packet, Bytes& out);
 class Deframer {
   public:
     struct Counts {
-        std::uint64_t bytes = 0;      // fed
-        std::uint64_t frames = 0;     // whole frames whose CRC holds (handed on)
-        std::uint64_t badFrames = 0;  // frames whose CRC does not hold, or too short for one
-        std::uint64_t empty = 0;      // 0x7E with nothing before it (a leading flag): skipped
+        std::uint64_t bytes = 0;   // fed
+        std::uint64_t frames = 0;  // whole frames whose CRC holds (handed on)
+        // Frames whose CRC does not hold, too short for a command byte and a CRC, broken by an
+        // escape right before the flag, or longer than any packet.
+        std::uint64_t badFrames = 0;
+        std::uint64_t empty = 0;  // 0x7E with nothing before it (a leading flag): skipped
     };
 
     // Calls onPacket(packet) for each good frame's packet (unescaped, CRC removed), in order;

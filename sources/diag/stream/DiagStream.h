@@ -67,6 +67,12 @@ class DiagStream {
     // initialisers inside the enclosing class.)
     DiagStream();
     explicit DiagStream(Options options);
+    // Moves, no copies (it keeps a pointer into its own counts).
+    DiagStream(DiagStream&&) = default;
+    DiagStream& operator=(DiagStream&&) = default;
+    DiagStream(const DiagStream&) = delete;
+    DiagStream& operator=(const DiagStream&) = delete;
+    ~DiagStream() = default;
 
     void feed(std::span<const std::uint8_t> bytes, const EventSink& onEvents,
               const ResponseSink& onResponse = {});

@@ -324,6 +324,21 @@ TEST(DiagStream, ResetForgetsAFrameBegunAndKeepsTheCounts) {
     EXPECT_EQ(logsOf(diag.stats(), kCellId, 0).decoded, 2U);
 }
 
+TEST(DiagStream, AMovedStreamKeepsCounting) {
+    const Bytes wire = framed({logPacket(kNoRow, kY2000Stamp, Bytes{1})});
+    DiagStream first;
+    first.feed(wire, {});
+    DiagStream moved(std::move(first));
+    moved.feed(wire, {});
+    DiagStream assigned;
+    assigned.feed(framed({logPacket(kNoRow, kY2000Stamp, Bytes{2})}), {});
+    assigned = std::move(moved);
+    assigned.feed(wire, {});
+    EXPECT_EQ(assigned.stats().logs.size(), 1U);
+    EXPECT_EQ(logsOf(assigned.stats(), kNoRow, 1).notDecoded, 3U);
+    EXPECT_EQ(assigned.stats().frames.frames, 3U);
+}
+
 TEST(DiagStream, PiecesOfEverySizeGiveTheSameEvents) {
     const auto ids = undecodedEventIds(1);
     const Bytes stream = [&] {
