@@ -14,8 +14,10 @@ namespace pyx::diag {
 
 namespace {
 
-// How long one read waits before the stream's numbers are published again.
+// How long one read waits at most; the stream's numbers are published (copied for stats())
+// at most every kPublishPeriod while reading, and at every end.
 constexpr std::chrono::milliseconds kPumpPeriod{500};
+constexpr std::chrono::milliseconds kPublishPeriod{200};
 
 std::string every(std::chrono::milliseconds period) {
     const auto ms = period.count();
@@ -71,12 +73,18 @@ struct DiagLink::State {
     void publish() {
         const std::lock_guard lock(mutex);
         published = stream.stats();
+        lastPublished = std::chrono::steady_clock::now();
+    }
+    // Publishes unless it was done less than kPublishPeriod ago.
+    void publishAtTimes() {
+        if (std::chrono::steady_clock::now() - lastPublished >= kPublishPeriod) publish();
     }
 
     const Options options;
     DiagStream stream;  // kept across re-attaches: the decoders remember the serving cell
     mutable std::mutex mutex;
     StreamStats published;
+    std::chrono::steady_clock::time_point lastPublished;  // the link's thread's own
 };
 
 DiagLink::DiagLink(Options options) : state_(std::make_unique<State>(std::move(options))) {}
@@ -95,6 +103,12 @@ void DiagLink::run(const std::stop_token& stop, const DiagStream::EventSink& onE
     std::set<std::string, std::less<>> sessionFaults;  // said once a run
     const auto sayOnce = [&](std::string_view line) {
         if (sessionFaults.emplace(line).second && options.onLine) options.onLine(line);
+    };
+    // The session's notes (the modem's version) once per start that succeeds: a modem that
+    // fails the start-up again and again is not introduced at every try.
+    std::set<std::string, std::less<>> notes;
+    const auto note = [&](std::string_view line) {
+        if (notes.emplace(line).second && options.onLine) options.onLine(line);
     };
     QmdlFile qmdl(options.qmdlFile, sayOnce);
     const std::string retry = every(options.retryEvery);
@@ -117,15 +131,16 @@ void DiagLink::run(const std::stop_token& stop, const DiagStream::EventSink& onE
             state_->stream.reset();
             DiagSession session(port, state_->stream, onEvents, signal,
                                 {.commandTimeout = options.commandTimeout,
-                                 .onNote = options.onLine,
+                                 .onNote = note,
                                  .onFault = sayOnce,
                                  .onBytes = [&qmdl](auto bytes) { qmdl.append(bytes); }});
             if (session.start()) {
                 fault.clear();
+                notes.clear();
                 state_->publish();
                 while (!signal.requested()) {
                     session.pump(kPumpPeriod);
-                    state_->publish();
+                    state_->publishAtTimes();
                 }
             }
             session.stop();

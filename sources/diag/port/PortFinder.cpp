@@ -124,6 +124,15 @@ PortSearch PortFinder::find() const {
             break;
         }
     }
+    if (search.device) return search;
+
+    // A PCIe (MHI) module's DIAG channel: a WWAN port of type QCDM, no tty.
+    std::vector<std::string> wwan;
+    for (const auto& entry : fs::directory_iterator(fs::path(sysfsRoot_) / "class" / "wwan", error))
+        if (entry.path().filename().string().find("qcdm") != std::string::npos)
+            wwan.push_back(entry.path().filename().string());
+    if (!wwan.empty())
+        search.device = (fs::path(devRoot_) / *std::min_element(wwan.begin(), wwan.end())).string();
     return search;
 }
 

@@ -1,7 +1,8 @@
 // Finds a modem's DIAG port among the USB interfaces the kernel lists under
 // <sysfsRoot>/bus/usb/devices/: a vendor-specific interface (class ff, subclass ff) with two
 // endpoints and protocol 30 (the newer modules' DIAG signature), or else protocol ff, whose
-// USB serial driver made it a ttyUSB port.
+// USB serial driver made it a ttyUSB port. Without one, a PCIe module's DIAG channel
+// (<sysfsRoot>/class/wwan/wwan0qcdm0, opened as /dev/wwan0qcdm0) is taken.
 #pragma once
 
 #include <cstdint>

@@ -10,7 +10,7 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-constexpr std::size_t kReadSize = 64 * 1024;
+constexpr std::size_t kReadSize = std::size_t{64} * 1024;
 
 std::string equipmentName(std::uint32_t id) {
     static constexpr char kDigits[] = "0123456789ABCDEF";

@@ -70,6 +70,16 @@ class Seen {
         const std::lock_guard lock(mutex_);
         return lines_;
     }
+    void end() {
+        const std::lock_guard lock(mutex_);
+        ended_ = true;
+        changed_.notify_all();
+    }
+    // Waits for run() to return.
+    bool waitForEnd() {
+        std::unique_lock lock(mutex_);
+        return changed_.wait_for(lock, kDeadline, [&] { return ended_; });
+    }
     std::size_t events() {
         const std::lock_guard lock(mutex_);
         return events_;
@@ -87,6 +97,7 @@ class Seen {
     std::vector<std::string> lines_;
     std::size_t packets_ = 0;
     std::size_t events_ = 0;
+    bool ended_ = false;
 };
 
 std::string allLines(Seen& seen) {
@@ -101,6 +112,7 @@ class RunningLink {
     explicit RunningLink(DiagLink::Options options) : link_(withLines(std::move(options))) {
         thread_ = std::jthread([this](std::stop_token stop) {
             link_.run(stop, [this](DecodedPacket& packet) { seen.packet(packet); });
+            seen.end();
         });
     }
     ~RunningLink() { stop(); }
@@ -113,6 +125,8 @@ class RunningLink {
         thread_.request_stop();
         thread_.join();
     }
+    // Asks the link to stop without waiting.
+    void requestStop() { thread_.request_stop(); }
     [[nodiscard]] StreamStats stats() const { return link_.stats(); }
 
     Seen seen;
@@ -204,6 +218,14 @@ Bytes cellIdPacket(std::uint32_t cellId) {
     return logPacket(0x4127, 0, test::wcdmaCellIdPayload(cellId));
 }
 
+// Log packets decoded and not, by (code, version).
+std::map<std::pair<std::uint16_t, int>, std::pair<std::uint64_t, std::uint64_t>> decodedByKind(
+    const StreamStats& stats) {
+    std::map<std::pair<std::uint16_t, int>, std::pair<std::uint64_t, std::uint64_t>> kinds;
+    for (const auto& [kind, counts] : stats.logs) kinds[kind] = {counts.decoded, counts.notDecoded};
+    return kinds;
+}
+
 Bytes readFile(const std::string& path) {
     std::ifstream in(path, std::ios::binary);
     return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
@@ -247,6 +269,65 @@ TEST(DiagLink, StartsWithVersionBuildIdRangesAndOneMaskPerEquipmentId) {
         << allLines(link.seen);
 }
 
+TEST(DiagLink, CodesBeyondTheModemsRangesAreLeftOutAndSaid) {
+    FakeDiagModem::Options modemOptions;
+    modemOptions.ranges[0xB] = 0xC1;  // LTE up to 0xB0C0 only
+    modemOptions.ranges[0x5] = 0;     // no GSM logging at all
+    FakeDiagModem modem(modemOptions);
+    RunningLink link(optionsFor(modem.path()));
+    ASSERT_TRUE(link.seen.waitForLine("DIAG logging on")) << allLines(link.seen);
+    const auto beyond = codesBeyond(modemOptions);
+    ASSERT_FALSE(beyond.empty());
+    EXPECT_EQ(link.seen.count("the modem's log ranges leave out " + std::to_string(beyond.size()) +
+                              " of the decoded log codes (" + codeList(beyond) +
+                              "); its item counts: 0x1:4095 0x4:4087 0x6:28 0x7:2910 0x9:2070 "
+                              "0xA:914 0xB:193 0xD:519"),
+              1U)
+        << allLines(link.seen);
+    const std::size_t on = DiagStream::decodedLogCodes().size() - beyond.size();
+    EXPECT_EQ(link.seen.count("DIAG logging on: " + std::to_string(on) + " log codes (" +
+                              std::to_string(beyond.size()) + " left out) and event reports"),
+              1U)
+        << allLines(link.seen);
+    const auto given = modem.masks();
+    EXPECT_FALSE(given.contains(5));
+    ASSERT_TRUE(given.contains(0xB));
+    EXPECT_EQ(given.at(0xB).items, 0xC1U);
+    EXPECT_EQ(given.at(0xB).bits, expectedMasks(modemOptions).at(0xB));
+}
+
+TEST(DiagLink, AModemWithoutBuildIdGoesOn) {
+    FakeDiagModem::Options options;
+    options.unanswered = {0x7C};
+    FakeDiagModem modem(options);
+    DiagLink::Options linkOptions = optionsFor(modem.path());
+    linkOptions.commandTimeout = 100ms;
+    RunningLink link(linkOptions);
+    ASSERT_TRUE(link.seen.waitForLine("DIAG logging on")) << allLines(link.seen);
+    EXPECT_EQ(link.seen.count("DIAG modem on " + modem.path() +
+                              ": sdx55.cp (compiled Nov  2 2021 22:13:12), no build id"),
+              1U)
+        << allLines(link.seen);
+}
+
+TEST(DiagLink, AModemThatGivesNoLogRangesIsSaidOnce) {
+    FakeDiagModem::Options options;
+    options.unanswered = {0x73};
+    FakeDiagModem modem(options);
+    DiagLink::Options linkOptions = optionsFor(modem.path());
+    linkOptions.commandTimeout = 100ms;
+    RunningLink link(linkOptions);
+    const std::string line = "no answer from " + modem.path() +
+                             " to the log range request within 100 ms; trying again every 50 ms";
+    ASSERT_TRUE(link.seen.waitForLine(line)) << allLines(link.seen);
+    ASSERT_TRUE(modem.waitForRequests([](const std::vector<Bytes>& requests) {
+        return std::count(requests.begin(), requests.end(), versionRequest()) >= 3;
+    }));
+    EXPECT_EQ(link.seen.count(line), 1U);
+    EXPECT_EQ(link.seen.count("DIAG modem on " + modem.path()), 1U) << allLines(link.seen);
+    EXPECT_EQ(link.seen.count("DIAG logging on"), 0U);
+}
+
 TEST(DiagLink, StopTurnsEventReportsAndLogMasksOff) {
     FakeDiagModem modem;
     RunningLink link(optionsFor(modem.path()));
@@ -268,7 +349,9 @@ TEST(DiagLink, HandsOnDecodedPacketsAndGoesOnPastBadFrames) {
     modem.writePacket(multiSim(1, cellIdPacket(0x00010003)));
     ASSERT_TRUE(link.seen.waitForPackets(2));
     EXPECT_GT(link.seen.events(), 0U);
-    EXPECT_EQ(link.stats().frames.badFrames, 1U);
+    // The numbers are published after each read is handed on.
+    EXPECT_TRUE(eventually([&] { return link.stats().frames.badFrames == 1; }))
+        << link.stats().frames.badFrames;
 }
 
 TEST(DiagLink, FramesBetweenARequestAndItsReplyGoToTheStream) {
@@ -310,6 +393,29 @@ TEST(DiagLink, AModemThatAnswersNothingIsSaidOnce) {
     const auto requests = modem.requests();
     EXPECT_TRUE(std::all_of(requests.begin(), requests.end(),
                             [](const Bytes& r) { return r == versionRequest(); }));
+}
+
+TEST(DiagLink, AStopEndsAWaitForAReplyAtOnce) {
+    FakeDiagModem::Options options;
+    options.answers = false;
+    FakeDiagModem modem(options);
+    DiagLink::Options linkOptions = optionsFor(modem.path());
+    linkOptions.commandTimeout = std::chrono::minutes(10);
+    RunningLink link(linkOptions);
+    ASSERT_TRUE(modem.waitForRequest(versionRequest()));
+    link.requestStop();
+    EXPECT_TRUE(link.seen.waitForEnd());
+    EXPECT_EQ(modem.requests(), std::vector<Bytes>{versionRequest()});
+}
+
+TEST(DiagLink, AStopEndsTheWaitForAPortAtOnce) {
+    TempFolder folder;
+    DiagLink::Options options = optionsFor(folder.file("diag"));
+    options.retryEvery = std::chrono::minutes(10);
+    RunningLink link(options);
+    ASSERT_TRUE(link.seen.waitForLine("is not there")) << allLines(link.seen);
+    link.requestStop();
+    EXPECT_TRUE(link.seen.waitForEnd());
 }
 
 TEST(DiagLink, ARefusedMaskIsSaidAndTheOthersAreSet) {
@@ -395,6 +501,14 @@ TEST(DiagLink, TheQmdlKeepsEveryByteTheModemWrote) {
     ASSERT_TRUE(eventually([&] { return link.stats().frames.bytes >= written.size(); }));
     link.stop();  // the replies to logging off are kept too
     EXPECT_EQ(readFile(options.qmdlFile), modem.written());
+    // It replays as the port read: the same packets decoded.
+    DiagStream replay;
+    std::size_t replayed = 0;
+    const Bytes kept = readFile(options.qmdlFile);
+    replay.feed(kept, [&](DecodedPacket&) { ++replayed; });
+    EXPECT_GT(replayed, 0U);
+    EXPECT_EQ(replay.stats().frames.badFrames, 1U);
+    EXPECT_EQ(decodedByKind(replay.stats()), decodedByKind(link.stats()));
 }
 
 TEST(DiagLink, NoPortFoundListsTheSerialInterfacesSeen) {

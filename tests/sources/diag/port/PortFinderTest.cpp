@@ -95,6 +95,19 @@ TEST(PortFinder, FindsTheTtyUnderItsTtyFolder) {
     EXPECT_EQ(*search.device, "/dev/ttyUSB2");
 }
 
+TEST(PortFinder, TakesAPcieModulesDiagChannelWithoutAUsbOne) {
+    FakeSysfs sysfs;
+    sysfs.interface("1-1:1.2", "ff", "00", "00", "02", "ttyUSB1");
+    for (const char* port : {"wwan0at0", "wwan0qcdm0", "wwan0mbim0"})
+        fs::create_directories(fs::path(sysfs.root()) / "class" / "wwan" / port);
+    const PortSearch search = PortFinder(sysfs.root()).find();
+    ASSERT_TRUE(search.device);
+    EXPECT_EQ(*search.device, "/dev/wwan0qcdm0");
+    // A USB DIAG interface comes first.
+    sysfs.interface("1-1:1.0", "ff", "ff", "ff", "02", "ttyUSB0");
+    EXPECT_EQ(PortFinder(sysfs.root()).find().device, "/dev/ttyUSB0");
+}
+
 TEST(PortFinder, NoneFoundListsTheSerialInterfacesSeen) {
     FakeSysfs sysfs;
     sysfs.device("1-1", "1199", "9071");

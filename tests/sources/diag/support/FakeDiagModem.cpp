@@ -105,7 +105,7 @@ void FakeDiagModem::serve() {
 }
 
 void FakeDiagModem::answer(const Bytes& request) {
-    if (request.empty()) return;
+    if (request.empty() || options_.unanswered.contains(request[0])) return;
     Bytes reply;
     switch (request[0]) {
         case 0x00:

@@ -31,6 +31,8 @@ class FakeDiagModem {
         std::array<std::uint32_t, 16> ranges = {0, 4095, 0,   0,   4087, 4087, 28, 2910,
                                                 0, 2070, 914, 521, 0,    519,  0,  0};
         bool answers = true;  // false: reads every request and answers none
+        // Requests with these command bytes are read and not answered.
+        std::set<std::uint8_t> unanswered;
         // SET_MASK for these equipment ids is answered with status 1.
         std::set<std::uint32_t> refuseMasks;
         // SET_MASK for these is answered with a bad-parameter error reply (0x14).
