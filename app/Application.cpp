@@ -55,7 +55,8 @@ int runPyxon(int argc, char** argv) {
     CLI::App cli{
         "Pyxon shows what the baseband reports: serving cell, neighbours, RRC state, transmit\n"
         "power, carrier aggregation, NAS contexts, bearers and SIM files, from the built-in\n"
-        "simulated baseband or a real modem through ModemManager.",
+        "simulated baseband, a real modem through ModemManager or a Qualcomm modem's\n"
+        "diagnostic port.",
         "pyxon"};
     Options options;
     cli.add_flag("--headless", options.headless,
@@ -74,6 +75,8 @@ int runPyxon(int argc, char** argv) {
                "  pyxon --source modem\n"
                "  pyxon --source modem --record drive.pyxrec\n"
                "  pyxon --source replay:drive.pyxrec --speed 4 --loop\n"
+               "  pyxon --source diag --qmdl drive.qmdl\n"
+               "  pyxon --source diag:drive.qmdl --speed 4\n"
                "  pyxon --chart 'LTE/Serving Cell Meas'\n"
                "  pyxon --screenshots shots   (simulated time runs 30 times faster unless "
                "--speed is given)\n");

@@ -10,17 +10,18 @@ namespace pyx {
 
 void SourceArgs::addTo(CLI::App& app) {
     app.add_option("--source", source,
-                   "Where events come from: sim, modem, modem:N or replay:FILE (see below)")
+                   "Where events come from: " + sources::sourceFormNames() + " (see below)")
         ->type_name("SOURCE")
         ->capture_default_str();
     app.add_option("--seed", seed, "Seed of the simulated baseband's drive")->capture_default_str();
     app.add_option("--speed", speed,
                    "Speed factor: the simulated baseband's events come this many times as often "
-                   "(> 0); a replay divides the recorded timing by it (0 = as fast as the store "
-                   "takes them)")
+                   "(> 0); a replay or a diag capture divides the recorded timing by it (0 = as "
+                   "fast as the store takes them)")
         ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
-    app.add_flag("--loop", loop, "Replay: start again at the end of the recording");
+    app.add_flag("--loop", loop,
+                 "Replay or diag capture: start again at the end of the recording or capture");
     CLI::Option* recordOption =
         app.add_option("--record", record,
                        "Keep every event of this run in FILE (.pyxrec), raw and in order")
@@ -33,6 +34,11 @@ void SourceArgs::addTo(CLI::App& app) {
         ->type_name("[HOST:PORT]")
         ->expected(0, 1)
         ->default_str("");
+    app.add_option("--qmdl", qmdl,
+                   "With a live diag source (diag, diag:PORT): keep the raw stream the port sends "
+                   "in FILE, a .qmdl that --source diag:FILE plays again (e.g. --source diag "
+                   "--qmdl drive.qmdl)")
+        ->type_name("FILE");
 }
 
 ProgramSource::ProgramSource(std::shared_ptr<velk::client::Transport> transport,
@@ -71,6 +77,10 @@ ProgramSource openProgramSource(const SourceArgs& args, const std::string& progr
     options.onEnd = std::move(onEnd);
     // A replay hands on the positions it recorded as a gpsd client does.
     options.onFix = onFix;
+    if (args.qmdl) {
+        if (args.qmdl->empty()) throw sources::SourceError("--qmdl: names no file");
+        options.qmdlFile = *args.qmdl;  // makeTransport refuses it but for a live diag source
+    }
     std::shared_ptr<velk::client::Transport> transport = sources::makeTransport(options);
     std::shared_ptr<recordings::RecordingWriter> recording;
     if (args.record) {

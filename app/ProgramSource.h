@@ -31,8 +31,10 @@ struct SourceArgs {
     bool append = false;
     // --gps [HOST:PORT]: positions from gpsd ("" = gpsd's default address).
     std::optional<std::string> gps;
+    // --qmdl FILE: a live diag source keeps the raw stream of its port there.
+    std::optional<std::string> qmdl;
 
-    // Adds --source, --seed, --speed, --loop, --record, --append and --gps to app.
+    // Adds --source, --seed, --speed, --loop, --record, --append, --gps and --qmdl to app.
     void addTo(CLI::App& app);
 };
 
@@ -73,7 +75,8 @@ class ProgramSource {
 // gpsd client, whose fixes go to the recording (with --record) and to onFix (on the client's
 // thread). A replay hands its recorded fixes to onFix at their times (on its thread). onEnd: called
 // when a replay without --loop reaches the end of its recording (see SourceOptions::onEnd). Throws
-// sources::SourceError with one line saying what is wrong.
+// sources::SourceError with one line saying what is wrong (--qmdl without a live diag source among
+// it).
 [[nodiscard]] ProgramSource openProgramSource(const SourceArgs& args,
                                               const std::string& programVersion,
                                               std::function<void(bool damaged)> onEnd = {},

@@ -1,90 +1,35 @@
 #include <unistd.h>
 
-#include <charconv>
 #include <climits>
 #include <string>
 
-#include "baseband/VelkWrapper.h"
-#include "core/MainQueue.h"
 #include "recordings/RecordingError.h"
 #include "recordings/RecordingTransport.h"
 #include "sources/Source.h"
-#include "sources/modem/ModemManagerBaseband.h"
-#include "sources/replay/ReplayTransport.h"
-#include "sources/sim/SimulatedBaseband.h"
+#include "sources/SourceTable.h"
 
 namespace pyx::sources {
-namespace {
-
-constexpr std::string_view kForms =
-    "expected sim, modem, modem:N (N the number at the end of the modem's object path) or "
-    "replay:FILE";
-
-std::uint32_t modemIndex(std::string_view text, std::string_view whole) {
-    std::uint32_t index = 0;
-    const auto* end = text.data() + text.size();
-    const auto [at, error] = std::from_chars(text.data(), end, index);
-    if (text.empty() || error != std::errc{} || at != end)
-        throw SourceError("--source " + std::string(whole) + ": '" + std::string(text) +
-                          "' is not a modem number; " + std::string(kForms));
-    return index;
-}
-
-}  // namespace
 
 SourceChoice parseSource(std::string_view text) {
-    SourceChoice choice;
-    choice.text = std::string(text);
-    if (text == "sim") return choice;
-    if (text == "modem" || text.starts_with("modem:")) {
-        choice.kind = SourceChoice::Kind::Modem;
-        if (text != "modem") choice.modemIndex = modemIndex(text.substr(6), text);
+    for (const SourceRow& row : sourceTable()) {
+        if (!row.claims(text)) continue;
+        SourceChoice choice;
+        choice.kind = row.kind;
+        choice.text = std::string(text);
+        row.parse(text, choice);
         return choice;
     }
-    if (text.starts_with("replay:")) {
-        choice.kind = SourceChoice::Kind::Replay;
-        choice.file = std::string(text.substr(7));
-        if (choice.file.empty())
-            throw SourceError("--source replay: names no file; example: replay:drive.pyxrec");
-        return choice;
-    }
-    throw SourceError("--source '" + std::string(text) + "': " + std::string(kForms));
+    throw SourceError("--source '" + std::string(text) + "': " + expectedForms());
 }
 
 std::shared_ptr<velk::client::Transport> makeTransport(const SourceOptions& options) {
-    switch (options.choice.kind) {
-        case SourceChoice::Kind::Sim:
-            try {
-                return std::make_shared<sim::SimulatedBaseband>(
-                    sim::SimulatedBaseband::Options{options.seed, options.speed, std::nullopt});
-            } catch (const std::invalid_argument& e) {
-                throw SourceError(e.what());
-            }
-        case SourceChoice::Kind::Modem: {
-            modem::ModemManagerBaseband::Options modem;
-            modem.modemIndex = options.choice.modemIndex;
-            return std::make_shared<modem::ModemManagerBaseband>(modem);
-        }
-        case SourceChoice::Kind::Replay:
-            try {
-                replay::ReplayTransport::Options replayOptions;
-                replayOptions.file = options.choice.file;
-                replayOptions.speed = options.speed;
-                replayOptions.loop = options.loop;
-                replayOptions.onEnd = options.onEnd;
-                replayOptions.onFix = options.onFix;
-                // What the client's serial queue and the main queue still hold: the events
-                // handed out that the store has not taken in yet.
-                replayOptions.backlog = options.backlog ? options.backlog : [] {
-                    return MainQueue::shared().pending() + VelkWrapper::queue().pending();
-                };
-                return std::make_shared<replay::ReplayTransport>(std::move(replayOptions));
-            } catch (const recordings::RecordingError& e) {
-                throw SourceError(std::string("--source replay: ") + e.what());
-            } catch (const std::invalid_argument& e) {
-                throw SourceError(e.what());
-            }
-    }
+    if (!options.qmdlFile.empty() && !isLiveDiag(options.choice))
+        throw SourceError("--qmdl " + options.qmdlFile +
+                          ": only with a live diag source (--source diag or diag:PORT), not "
+                          "with --source " +
+                          options.choice.text);
+    for (const SourceRow& row : sourceTable())
+        if (row.kind == options.choice.kind) return row.make(options);
     throw SourceError("--source " + options.choice.text + ": unknown source");
 }
 
@@ -97,7 +42,8 @@ RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
     writer.session.source = options.choice.text;
     if (options.choice.kind == SourceChoice::Kind::Sim)
         writer.session.seed = static_cast<std::int64_t>(options.seed);
-    if (options.choice.kind != SourceChoice::Kind::Modem) writer.session.speed = options.speed;
+    if (options.choice.kind != SourceChoice::Kind::Modem && !isLiveDiag(options.choice))
+        writer.session.speed = options.speed;
     char host[HOST_NAME_MAX + 1] = {};
     if (gethostname(host, sizeof host - 1) == 0) writer.session.host = host;
     try {
@@ -111,16 +57,13 @@ RecordedSource recordSource(std::shared_ptr<velk::client::Transport> source,
 }
 
 std::string_view sourceHelp() {
-    return "Sources (--source):\n"
-           "  sim            the built-in simulated baseband (default); --seed and --speed apply\n"
-           "                 example: --source sim --seed 7 --speed 20\n"
-           "  modem          the first modem ModemManager knows, on the system D-Bus\n"
-           "                 example: --source modem\n"
-           "  modem:N        the modem whose object path ends in /Modem/N\n"
-           "                 example: --source modem:0\n"
-           "  replay:FILE    a recording made with --record; --speed (0 = as fast as the store\n"
-           "                 takes it) and --loop apply\n"
-           "                 example: --source replay:drive.pyxrec --speed 10\n";
+    // Built once, on first use, from the table.
+    static const std::string help = [] {
+        std::string text = "Sources (--source):\n";
+        for (const SourceRow& row : sourceTable()) text += row.help;
+        return text;
+    }();
+    return help;
 }
 
 std::string_view recordingHelp() {

@@ -129,15 +129,19 @@ Subcommand addListenCommand(CLI::App& pyxonctl) {
     listen->footer(
         std::string(sources::sourceHelp()) + "\n" + std::string(sources::recordingHelp()) +
         "\nWithout --duration or --count it runs until SIGINT or SIGTERM, or until a replay\n"
-        "without --loop reaches the end of its recording; it exits 0, or 1 when the recording\n"
-        "turns out damaged (what was read before the damage is printed).\n"
+        "without --loop reaches the end of its recording (a diag capture the end of the\n"
+        "capture); it exits 0, or 1 when the recording turns out damaged (what was read before\n"
+        "the damage is printed).\n"
         "Examples:\n"
         "  pyxonctl listen --speed 20 --count 100 > drive.jsonl\n"
         "  pyxonctl listen --source modem --duration 10 | pyxonctl screen LTE \"Serving "
         "Cell Meas\"\n"
         "  pyxonctl listen --source modem --duration 3600 --record drive.pyxrec > "
         "/dev/null\n"
-        "  pyxonctl listen --source replay:drive.pyxrec --speed 0 | pyxonctl decode\n");
+        "  pyxonctl listen --source replay:drive.pyxrec --speed 0 | pyxonctl decode\n"
+        "  pyxonctl listen --source diag:drive.qmdl --speed 0 | pyxonctl screen UMTS \"Serving "
+        "Cell Info\"\n"
+        "  pyxonctl listen --source diag --qmdl drive.qmdl --record drive.pyxrec > /dev/null\n");
     return Subcommand{listen, [options] { return runListen(*options); }};
 }
 

@@ -124,6 +124,43 @@ std::vector<std::string> missingLines(const std::vector<std::string>& lines) {
     return missing;
 }
 
+// What pyxon prints on each of its streams and how it ends, for a run that ends by itself.
+struct Ended {
+    int status = -1;
+    std::vector<std::string> out;
+    std::vector<std::string> err;
+};
+Ended runToItsEnd(std::vector<std::string> args) {
+    ChildProcess child = spawn(std::move(args));
+    Ended ended;
+    if (child.pid() <= 0) return ended;
+    LineCollector o(child.takeStdout());
+    LineCollector e(child.takeStderr());
+    ended.status = child.wait(std::chrono::seconds(60));
+    ended.out = o.all();
+    ended.err = e.all();
+    return ended;
+}
+
+TEST(PyxonOptions, QmdlWithoutALiveDiagSourceIsOneLineWithStatusTwo) {
+    const Ended ended = runToItsEnd({PYXON_BINARY, "--headless", "--qmdl", "drive.qmdl"});
+    EXPECT_EQ(ended.status, 2);
+    EXPECT_EQ(ended.err, std::vector<std::string>{
+                             "pyxon: --qmdl drive.qmdl: only with a live diag source (--source "
+                             "diag or diag:PORT), not with --source sim"});
+}
+
+TEST(PyxonOptions, HelpNamesTheDiagSourceAndQmdlWithExamples) {
+    const Ended ended = runToItsEnd({PYXON_BINARY, "--help"});
+    EXPECT_EQ(ended.status, 0);
+    std::string out;
+    for (const std::string& line : ended.out) out += line + "\n";
+    for (const char* text :
+         {"--qmdl FILE", "  diag:PORT      ", "  diag:FILE      ",
+          "pyxon --source diag --qmdl drive.qmdl", "pyxon --source diag:drive.qmdl --speed 4"})
+        EXPECT_NE(out.find(text), std::string::npos) << text;
+}
+
 }  // namespace
 
 TEST(PyxonHeadless, ShowsEveryKindOnTheSimulatedBasebandAndExitsCleanlyOnSigterm) {
