@@ -320,17 +320,21 @@ std::vector<std::pair<std::string, std::string>> badFiles(const TempDir& dir) {
         {future, "written in format version 9 by a newer Pyxon; this one reads up to version 2"}};
 }
 
+// What info says of a bad file: it reads DIAG captures too, so a file that is not a recording
+// is said to be neither.
+std::string infoSays(const std::string& what) {
+    return what.starts_with("not a Pyxon recording")
+               ? what + " nor a DIAG capture (no DIAG frame in it)"
+               : what;
+}
+
 TEST(InfoCommand, EachBadFileGivesOneLineNamingItAndANonZeroExit) {
     const TempDir dir;
     for (const auto& [file, what] : badFiles(dir)) {
         const Outcome run = info(file);
         EXPECT_EQ(run.status, 1) << file;
         EXPECT_EQ(run.out, "") << file;
-        // info reads DIAG captures too, so a file that is no database is said to be neither.
-        const std::string neither = what.starts_with("not a Pyxon recording")
-                                        ? " nor a DIAG capture (no DIAG frame in it)"
-                                        : "";
-        EXPECT_EQ(run.err, "pyxonctl info: " + file + ": " + what + neither + "\n");
+        EXPECT_EQ(run.err, "pyxonctl info: " + file + ": " + infoSays(what) + "\n");
     }
 }
 
@@ -570,7 +574,7 @@ TEST(RecordingPrograms, InfoExportAndReplayOfABadFileExitNonZeroWithOneLine) {
     for (const auto& [file, what] : badFiles(dir)) {
         const Outcome infoRun = program("info '" + file + "'");
         EXPECT_EQ(infoRun.status, 1);
-        EXPECT_EQ(infoRun.err, "pyxonctl info: " + file + ": " + what + "\n");
+        EXPECT_EQ(infoRun.err, "pyxonctl info: " + file + ": " + infoSays(what) + "\n");
         const Outcome exportRun = program("export '" + file + "' --format csv");
         EXPECT_EQ(exportRun.status, 1);
         EXPECT_EQ(exportRun.err, "pyxonctl export: " + file + ": " + what + "\n");
