@@ -11,6 +11,7 @@
 #include "baseband/velk/Names.h"
 #include "core/Format.h"
 #include "core/Log.h"
+#include "core/PlaybackSpeed.h"
 #include "sources/sim/BasebandCommands.h"
 
 namespace pyx::diag {
@@ -18,15 +19,8 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-double checkedSpeed(double speed) {
-    if (std::isnan(speed) || speed < 0.0)
-        throw std::invalid_argument(
-            format("the capture's speed must be 0 (as fast as taken) or more, not %g", speed));
-    return speed;
-}
-
 DiagTransport::Options checked(DiagTransport::Options options) {
-    options.speed = checkedSpeed(options.speed);
+    options.speed = checkedPlaybackSpeed(options.speed, "the capture's speed");
     if (options.chunkBytes == 0) options.chunkBytes = 64 * 1024;
     if (!options.link.onLine)
         options.link.onLine = [](std::string_view line) { systemFault(line); };

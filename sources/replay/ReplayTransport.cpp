@@ -8,6 +8,7 @@
 #include "baseband/velk/Names.h"
 #include "core/Format.h"
 #include "core/Log.h"
+#include "core/PlaybackSpeed.h"
 #include "recordings/RecordingError.h"
 
 namespace pyx::replay {
@@ -15,18 +16,15 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-double checkedSpeed(double speed) {
-    if (std::isnan(speed) || speed < 0.0)
-        throw std::invalid_argument(
-            format("the replay speed must be 0 (as fast as taken) or more, not %g", speed));
-    return speed;
-}
-
 }  // namespace
 
 ReplayTransport::ReplayTransport(Options options)
-    : options_{std::move(options.file),    checkedSpeed(options.speed), options.loop,
-               std::move(options.backlog), options.maxBacklog,          std::move(options.onEnd),
+    : options_{std::move(options.file),
+               checkedPlaybackSpeed(options.speed, "the replay speed"),
+               options.loop,
+               std::move(options.backlog),
+               options.maxBacklog,
+               std::move(options.onEnd),
                std::move(options.onFix)},
       reader_(options_.file) {
     if (options_.onFix)

@@ -58,20 +58,6 @@ Bytes capturedPacket(const std::string& file, std::uint16_t code, std::size_t in
     return p;
 }
 
-// Runs payload through the row for code with the packet time given (the harness's is fixed).
-Decoded decodeAt(std::uint16_t code, const Bytes& payload, DecodeState& state,
-                 std::uint64_t timeMs) {
-    Decoded result;
-    const LogDecoderRow* row = rowFor(table(), code, payload);
-    if (row == nullptr) return result;
-    LogPacket packet;
-    packet.code = code;
-    packet.timeMs = timeMs;
-    packet.payload = payload;
-    result.decoded = row->decode(packet, state, result.events);
-    return result;
-}
-
 // A copy of the index-th element of list in the one event of metricID among events.
 Dict elementOf(const std::vector<MetricOut>& events, std::int64_t metricID, const std::string& list,
                std::size_t index = 0) {
@@ -318,7 +304,8 @@ TEST(LteConnectedDecoders, NoisePayloadsNeverReadPastTheirEndAndWhatIsWrittenDec
                               static_cast<std::uint8_t>((body + 4) >> 8)};
                 for (std::size_t i = 0; i < body; ++i)
                     payload.push_back(static_cast<std::uint8_t>(next() % (round < 2 ? 4 : 256)));
-                const Decoded d = decodeAt(sub.code, payload, state, kTimeMs + next() % 5000);
+                const Decoded d =
+                    decode(table(), sub.code, payload, state, kTimeMs + next() % 5000);
                 if (!d.decoded) continue;
                 ++taken;
                 for (const MetricOut& e : d.events) {
@@ -644,18 +631,18 @@ TEST(LteConnectedCaptures, ACarrierNotMeasuredForTwoSecondsIsNoLongerListed) {
     const auto serving = capturePayloads(kAtt, kServingMeas);
     const auto neighbours = capturePayloads(kAtt, kNeighbourMeas);
     DecodeState state;
-    ASSERT_TRUE(decodeAt(kServingMeas, serving.at(1), state, kTimeMs).decoded);  // secondary
-    ASSERT_TRUE(decodeAt(kNeighbourMeas, neighbours.at(1), state, kTimeMs).decoded);
-    const Decoded soon = decodeAt(kServingMeas, serving.at(0), state, kTimeMs + 2000);
+    ASSERT_TRUE(decode(table(), kServingMeas, serving.at(1), state, kTimeMs).decoded);  // secondary
+    ASSERT_TRUE(decode(table(), kNeighbourMeas, neighbours.at(1), state, kTimeMs).decoded);
+    const Decoded soon = decode(table(), kServingMeas, serving.at(0), state, kTimeMs + 2000);
     EXPECT_EQ(lengthOf(eventOf(soon.events, id::K_LTE_CA_STATUS), "scc_list"), 2U);
-    const Decoded late = decodeAt(kServingMeas, serving.at(2), state, kTimeMs + 2001);
+    const Decoded late = decode(table(), kServingMeas, serving.at(2), state, kTimeMs + 2001);
     const Dict status = eventOf(late.events, id::K_LTE_CA_STATUS);
     ASSERT_EQ(lengthOf(status, "scc_list"), 1U);
     EXPECT_EQ(text(element(status, "scc_list", 0), "index"), "0");
     EXPECT_EQ(lengthOf(eventOf(late.events, id::K_LTE_SECONDARYCELL_MEAS), "scc_rx_measurement"),
               0U);
     EXPECT_FALSE(eventOf(late.events, id::K_LTE_COMPCARR_INFO).contains("scc0_earfcn"));
-    const Decoded nbr = decodeAt(kNeighbourMeas, neighbours.at(0), state, kTimeMs + 2001);
+    const Decoded nbr = decode(table(), kNeighbourMeas, neighbours.at(0), state, kTimeMs + 2001);
     const Dict list = eventOf(nbr.events, id::K_LTE_INTRARAT_MEAS);
     ASSERT_EQ(lengthOf(list, "meas_nbr_eutra"), 2U);
     EXPECT_EQ(text(element(list, "meas_nbr_eutra", 1), "nbr_earfcn"), "5780");
@@ -734,7 +721,7 @@ TEST(LteConnectedScreens, TheWholeAttCaptureEndsOnItsLastMeasurements) {
     DecodeState state;
     std::size_t withBothCarriers = 0;
     for (const CapturedPacket& p : capturePackets(kAtt, kConnectedCodes)) {
-        const Decoded d = decodeAt(p.code, p.payload, state, timeMsOf(p));
+        const Decoded d = decode(table(), p.code, p.payload, state, timeMsOf(p));
         ASSERT_TRUE(d.decoded);
         feed(store, d.events);
         withBothCarriers += state.lte.connected.carriers.size() == 2 ? 1 : 0;

@@ -319,57 +319,44 @@ TEST(LteRrcDecoders, EachMessageOfTheCcchsAndDcchsTellsItsState) {
 
 // ---- Transitions and their durations ----
 
-// Runs a log packet through the table at timeMs.
-Decoded decodeAt(std::uint16_t code, const Bytes& payload, DecodeState& state,
-                 std::uint64_t timeMs) {
-    Decoded result;
-    const LogDecoderRow* row = rowFor(lteRrcDecoders(), code, payload);
-    if (row == nullptr) return result;
-    LogPacket packet;
-    packet.code = code;
-    packet.timeMs = timeMs;
-    packet.payload = payload;
-    result.decoded = row->decode(packet, state, result.events);
-    return result;
-}
-
 TEST(LteRrcDecoders, AChangeComesWithThePreviousStateAndHowLongItLastedWhenBothEndsWereSeen) {
     DecodeState state;
     const std::uint64_t t0 = kTimeMs;
     // Connected when the capture begins: a measurement report says so, not since when.
-    Decoded d = decodeAt(kOta, otaPacket(8, 8, 0x08), state, t0);
+    Decoded d = decode(lteRrcDecoders(), kOta, otaPacket(8, 8, 0x08), state, t0);
     Dict written = eventOf(d.events, id::K_LTE_RRC_STATE);
     EXPECT_EQ(text(written, "state"), "KLTE_RRC_STATE_CONNECTED");
     EXPECT_FALSE(written.contains("prev_state"));
     // Released 3 s later: the connected state's start was not seen, so no duration.
-    d = decodeAt(kOta, otaPacket(8, 6, 0x28), state, t0 + 3000);
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 6, 0x28), state, t0 + 3000);
     written = eventOf(d.events, id::K_LTE_RRC_STATE);
     EXPECT_EQ(text(written, "state"), "KLTE_RRC_STATE_IDLE");
     EXPECT_EQ(text(written, "prev_state"), "KLTE_RRC_STATE_CONNECTED");
     EXPECT_FALSE(written.contains("prev_state_dur_ms"));
     // A request 12.5 s after the release: idle lasted 12 500 ms.
-    d = decodeAt(kOta, otaPacket(8, 7, 0x40), state, t0 + 15'500);
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 7, 0x40), state, t0 + 15'500);
     written = eventOf(d.events, id::K_LTE_RRC_STATE);
     EXPECT_EQ(text(written, "state"), "KLTE_RRC_STATE_ATMPT_CONNECTION");
     EXPECT_EQ(text(written, "prev_state"), "KLTE_RRC_STATE_IDLE");
     EXPECT_EQ(text(written, "prev_state_dur_ms"), "12500");
     // The setup does not change the state; the setup complete 80 ms after the request does.
-    EXPECT_TRUE(decodeAt(kOta, otaPacket(8, 5, 0x60), state, t0 + 15'540).events.empty());
-    d = decodeAt(kOta, otaPacket(8, 8, 0x20), state, t0 + 15'580);
+    EXPECT_TRUE(
+        decode(lteRrcDecoders(), kOta, otaPacket(8, 5, 0x60), state, t0 + 15'540).events.empty());
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 8, 0x20), state, t0 + 15'580);
     written = eventOf(d.events, id::K_LTE_RRC_STATE);
     EXPECT_EQ(text(written, "state"), "KLTE_RRC_STATE_CONNECTED");
     EXPECT_EQ(text(written, "prev_state_dur_ms"), "80");
     // A missed release (attach_sample has such requests): a request is sent from idle only,
     // so the state before is idle, for a time unknown.
-    d = decodeAt(kOta, otaPacket(8, 7, 0x40), state, t0 + 60'000);
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 7, 0x40), state, t0 + 60'000);
     written = eventOf(d.events, id::K_LTE_RRC_STATE);
     EXPECT_EQ(text(written, "state"), "KLTE_RRC_STATE_ATMPT_CONNECTION");
     EXPECT_EQ(text(written, "prev_state"), "KLTE_RRC_STATE_IDLE");
     EXPECT_FALSE(written.contains("prev_state_dur_ms"));
     // A re-establishment request is sent from a connection: the connection lasted from its
     // setup complete until then.
-    d = decodeAt(kOta, otaPacket(8, 8, 0x20), state, t0 + 60'100);
-    d = decodeAt(kOta, otaPacket(8, 7, 0x00), state, t0 + 70'100);
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 8, 0x20), state, t0 + 60'100);
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 7, 0x00), state, t0 + 70'100);
     written = eventOf(d.events, id::K_LTE_RRC_STATE);
     EXPECT_EQ(text(written, "prev_state"), "KLTE_RRC_STATE_CONNECTED");
     EXPECT_EQ(text(written, "prev_state_dur_ms"), "10000");
@@ -378,10 +365,10 @@ TEST(LteRrcDecoders, AChangeComesWithThePreviousStateAndHowLongItLastedWhenBothE
     DecodeState fresh;
     fresh.lte.rrc.state = KLTE_RRC_STATE_IDLE;
     fresh.lte.rrc.sinceMs = t0;
-    d = decodeAt(kOta, otaPacket(8, 5, 0x60), fresh, t0 + 1000);
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 5, 0x60), fresh, t0 + 1000);
     written = eventOf(d.events, id::K_LTE_RRC_STATE);
     EXPECT_EQ(text(written, "prev_state_dur_ms"), "");  // the idle state's end is not seen
-    d = decodeAt(kOta, otaPacket(8, 8, 0x20), fresh, t0 + 1040);
+    d = decode(lteRrcDecoders(), kOta, otaPacket(8, 8, 0x20), fresh, t0 + 1040);
     EXPECT_FALSE(eventOf(d.events, id::K_LTE_RRC_STATE).contains("prev_state_dur_ms"));
 }
 

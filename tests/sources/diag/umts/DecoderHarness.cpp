@@ -25,13 +25,13 @@ const LogDecoderRow* rowFor(std::span<const LogDecoderRow> table, std::uint16_t 
 }
 
 Decoded decode(std::span<const LogDecoderRow> table, std::uint16_t code,
-               std::span<const std::uint8_t> payload, DecodeState& state) {
+               std::span<const std::uint8_t> payload, DecodeState& state, std::uint64_t timeMs) {
     Decoded result;
     const LogDecoderRow* row = rowFor(table, code, payload);
     if (row == nullptr) return result;
     LogPacket packet;
     packet.code = code;
-    packet.timeMs = kTimeMs;
+    packet.timeMs = timeMs;
     packet.payload = payload;
     result.decoded = row->decode(packet, state, result.events);
     return result;

@@ -27,9 +27,11 @@ struct Decoded {
     std::vector<MetricOut> events;
 };
 
-// Runs payload through the row of table for code, with state carried by the caller.
+// Runs payload through the row of table for code, with state carried by the caller, at the
+// packet time timeMs.
 [[nodiscard]] Decoded decode(std::span<const LogDecoderRow> table, std::uint16_t code,
-                             std::span<const std::uint8_t> payload, DecodeState& state);
+                             std::span<const std::uint8_t> payload, DecodeState& state,
+                             std::uint64_t timeMs = kTimeMs);
 
 // The dictionary form of the one event of metricID among events (fails the test otherwise).
 [[nodiscard]] Dict eventOf(const std::vector<MetricOut>& events, std::int64_t metricID);
