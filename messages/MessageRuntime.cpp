@@ -240,8 +240,11 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
 
         if (KBBMetricUtility::isValidMetricIdTag(tag, d)) {
             const std::uint64_t value = decodeVarint(bytes, pos, limit, error);
-            systemLog(format("Unknown tag: %x:%u", static_cast<unsigned>(tag),
-                             static_cast<unsigned>(value & 0xFFFFFFFFU)));
+            // The line is built only when the system log is read.
+            if (systemLogSink().on()) {
+                systemLog(format("Unknown tag: %x:%u", static_cast<unsigned>(tag),
+                                 static_cast<unsigned>(value & 0xFFFFFFFFU)));
+            }
             continue;
         }
         const std::uint8_t index = tag < tagCount ? tagIndex[tag] : MessageDescriptor::kNoField;
