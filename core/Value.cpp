@@ -1,8 +1,11 @@
 #include "core/Value.h"
 
+#include <array>
 #include <charconv>
 #include <cmath>
+#include <cstring>
 #include <limits>
+#include <string_view>
 
 namespace pyx {
 
@@ -91,42 +94,151 @@ namespace {
 
 constexpr char kHex[] = "0123456789abcdef";
 
-// The appenders below write straight into the caller's text: descriptions are built for every
-// stored record (its arrival line), so no temporary strings are made per value.
-template <class Int>
-void appendInteger(std::string& out, Int value) {
-    char buf[24];
-    const auto res = std::to_chars(buf, buf + sizeof buf, value);
-    out.append(buf, res.ptr);
-}
+// Where a description is written: a buffer on the stack, handed to the caller's text a
+// kilobyte at a time. A description is hundreds of short pieces (a separator, a key, a number);
+// appending each to the string cost more than writing it. Descriptions are built for every
+// stored record (its arrival line).
+class DescriptionWriter {
+  public:
+    static constexpr std::size_t kSize = 1024;
 
-void appendFloat(std::string& out, float value) {
-    char buf[64];
-    const auto res = std::to_chars(buf, buf + sizeof buf, value);
-    const std::string_view text(buf, static_cast<std::size_t>(res.ptr - buf));
-    out.append(text);
-    if (std::isfinite(value) && text.find_first_of(".e") == std::string_view::npos) out += ".0";
-}
+    explicit DescriptionWriter(std::string& out) : out_(out) {}
+    DescriptionWriter(const DescriptionWriter&) = delete;
+    DescriptionWriter& operator=(const DescriptionWriter&) = delete;
 
-void appendBytes(std::string& out, const Bytes& bytes) {
-    const std::size_t n = bytes.size();
-    const std::size_t start = out.size();
-    out.resize(start + 2 + n * 2 + (n == 0 ? 0 : (n - 1) / 4));
-    char* p = out.data() + start;
-    *p++ = '<';
-    for (std::size_t i = 0; i < n; ++i) {
-        if (i != 0 && i % 4 == 0) *p++ = ' ';
-        *p++ = kHex[bytes[i] >> 4];
-        *p++ = kHex[bytes[i] & 0xF];
+    void put(char c) {
+        if (used_ == kSize) flush();
+        buffer_[used_++] = c;
     }
-    *p = '>';
+    void put(std::string_view text) {
+        if (text.size() > kSize - used_) {
+            flush();
+            if (text.size() > kSize) {
+                out_.append(text);
+                return;
+            }
+        }
+        std::memcpy(buffer_.data() + used_, text.data(), text.size());
+        used_ += text.size();
+    }
+    // Room for n characters (at most kSize) to be written and then kept with commit().
+    char* room(std::size_t n) {
+        if (n > kSize - used_) flush();
+        return buffer_.data() + used_;
+    }
+    void commit(const char* end) { used_ = static_cast<std::size_t>(end - buffer_.data()); }
+    // Hands what is buffered to the text; called once the description is complete.
+    void flush() {
+        out_.append(buffer_.data(), used_);
+        used_ = 0;
+    }
+
+  private:
+    std::string& out_;
+    std::array<char, kSize> buffer_;
+    std::size_t used_ = 0;
+};
+
+template <class Int>
+void writeInteger(DescriptionWriter& w, Int value) {
+    char* const p = w.room(24);
+    w.commit(std::to_chars(p, p + 24, value).ptr);
+}
+
+// The shortest text that reads back as the same float, with ".0" added to a finite value that
+// has neither a point nor an exponent.
+void writeFloat(DescriptionWriter& w, float value) {
+    char* const p = w.room(64);
+    char* const end = std::to_chars(p, p + 62, value).ptr;
+    const std::string_view text(p, static_cast<std::size_t>(end - p));
+    if (std::isfinite(value) && text.find_first_of(".e") == std::string_view::npos) {
+        end[0] = '.';
+        end[1] = '0';
+        w.commit(end + 2);
+    } else {
+        w.commit(end);
+    }
+}
+
+void writeBytes(DescriptionWriter& w, const Bytes& bytes) {
+    w.put('<');
+    const std::size_t n = bytes.size();
+    for (std::size_t i = 0; i < n; i += 4) {
+        // A group of up to four bytes, with the blank that separates it from the one before.
+        char* p = w.room(9);
+        if (i != 0) *p++ = ' ';
+        const std::size_t last = i + 4 < n ? i + 4 : n;
+        for (std::size_t k = i; k < last; ++k) {
+            *p++ = kHex[bytes[k] >> 4];
+            *p++ = kHex[bytes[k] & 0xF];
+        }
+        w.commit(p);
+    }
+    w.put('>');
+}
+
+void writeValue(DescriptionWriter& w, const Value& value);
+
+void writeDict(DescriptionWriter& w, const Dict& dict) {
+    w.put('{');
+    bool first = true;
+    for (const auto& [key, value] : dict) {
+        if (!first) w.put(std::string_view(", "));
+        first = false;
+        w.put(key);
+        w.put(std::string_view(": "));
+        writeValue(w, value);
+    }
+    w.put('}');
+}
+
+void writeValue(DescriptionWriter& w, const Value& value) {
+    switch (value.kind()) {
+        case Value::Kind::Null:
+            w.put(std::string_view("(null)"));
+            break;
+        case Value::Kind::Bool:
+            w.put(value.asBool() ? '1' : '0');
+            break;
+        case Value::Kind::Int:
+            writeInteger(w, value.asInt());
+            break;
+        case Value::Kind::UInt:
+            writeInteger(w, value.asUInt());
+            break;
+        case Value::Kind::Float:
+            writeFloat(w, value.asFloat());
+            break;
+        case Value::Kind::String:
+            w.put(value.asString());
+            break;
+        case Value::Kind::Data:
+            writeBytes(w, value.asBytes());
+            break;
+        case Value::Kind::List: {
+            w.put('[');
+            bool first = true;
+            for (const auto& v : value.asArray()) {
+                if (!first) w.put(std::string_view(", "));
+                first = false;
+                writeValue(w, v);
+            }
+            w.put(']');
+            break;
+        }
+        case Value::Kind::Map:
+            writeDict(w, value.asDict());
+            break;
+    }
 }
 
 }  // namespace
 
 std::string formatFloat(float value) {
     std::string text;
-    appendFloat(text, value);
+    DescriptionWriter w(text);
+    writeFloat(w, value);
+    w.flush();
     return text;
 }
 
@@ -142,61 +254,22 @@ std::string hexString(const Bytes& bytes) {
 
 std::string describeBytes(const Bytes& bytes) {
     std::string out;
-    appendBytes(out, bytes);
+    DescriptionWriter w(out);
+    writeBytes(w, bytes);
+    w.flush();
     return out;
 }
 
 void Value::appendDescription(std::string& out) const {
-    switch (kind()) {
-        case Kind::Null:
-            out += "(null)";
-            break;
-        case Kind::Bool:
-            out += asBool() ? '1' : '0';
-            break;
-        case Kind::Int:
-            appendInteger(out, asInt());
-            break;
-        case Kind::UInt:
-            appendInteger(out, asUInt());
-            break;
-        case Kind::Float:
-            appendFloat(out, asFloat());
-            break;
-        case Kind::String:
-            out += asString();
-            break;
-        case Kind::Data:
-            appendBytes(out, asBytes());
-            break;
-        case Kind::List: {
-            out += '[';
-            bool first = true;
-            for (const auto& v : asArray()) {
-                if (!first) out += ", ";
-                first = false;
-                v.appendDescription(out);
-            }
-            out += ']';
-            break;
-        }
-        case Kind::Map:
-            pyx::appendDescription(out, asDict());
-            break;
-    }
+    DescriptionWriter w(out);
+    writeValue(w, *this);
+    w.flush();
 }
 
 void appendDescription(std::string& out, const Dict& dict) {
-    out += '{';
-    bool first = true;
-    for (const auto& [key, value] : dict) {
-        if (!first) out += ", ";
-        first = false;
-        out += key;
-        out += ": ";
-        value.appendDescription(out);
-    }
-    out += '}';
+    DescriptionWriter w(out);
+    writeDict(w, dict);
+    w.flush();
 }
 
 std::string Value::description() const {

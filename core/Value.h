@@ -58,9 +58,11 @@ class Dict {
     Value& set(std::string key, Value value);
     // Appends without looking for an existing key; for builders that know keys are unique.
     Value& append(std::string key, Value value);
-    // As append, building the entry in place: the key is copied once and the value moved
-    // once (the decoders build every dictionary this way).
-    Value& emplace(std::string_view key, Value&& value);
+    // As append, building the entry in place: the key is copied once and the value made
+    // where it is kept, from what the Value would be made of (the decoders build every
+    // dictionary this way: an integer, a text, a list or a dictionary).
+    template <class V>
+    Value& emplace(std::string_view key, V&& value);
     // Removes the key if present; returns whether it was.
     bool erase(std::string_view key);
     void reserve(std::size_t n);
@@ -169,11 +171,9 @@ inline const DictEntry& Dict::at(std::size_t index) const {
 inline void Dict::reserve(std::size_t n) {
     entries_.reserve(n);
 }
-inline Value& Dict::emplace(std::string_view key, Value&& value) {
-    DictEntry& entry = entries_.emplace_back();
-    entry.key.assign(key.data(), key.size());
-    entry.value = std::move(value);
-    return entry.value;
+template <class V>
+inline Value& Dict::emplace(std::string_view key, V&& value) {
+    return entries_.emplace_back(std::string(key), std::forward<V>(value)).value;
 }
 
 // The shortest text that reads back as the same float, always with a decimal point

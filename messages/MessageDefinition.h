@@ -2,8 +2,11 @@
 // messages/MessageDescriptors.cpp: PYX_DEFINE_MESSAGE(Class) once per class.
 #pragma once
 
+#include <array>
 #include <cstddef>
+#include <cstdint>
 
+#include "messages/KBBMetricUtility.h"
 #include "messages/Message.h"
 
 #define PYX_FD_SCALAR(Kind, tag, key, name)                                     \
@@ -52,6 +55,22 @@
                            nullptr,                                              \
                            &::pyx::detail::kSubMessageOps<Class>},
 
+namespace pyx::detail {
+
+// The reader's index: the tag index without the fields numbered as metric tags, which the reader
+// never stores (it takes such a number for a metric tag). With it the reader asks the
+// metric-tag table only about the numbers it finds no field for.
+template <std::size_t Size, std::size_t N>
+constexpr std::array<std::uint8_t, Size> buildReadIndex(const FieldDescriptor (&fields)[N]) {
+    std::array<std::uint8_t, Size> index = buildTagIndex<Size>(fields);
+    for (const auto& e : KBBMetricUtility::kEntries) {
+        if (e.tag < Size) index[e.tag] = MessageDescriptor::kNoField;
+    }
+    return index;
+}
+
+}  // namespace pyx::detail
+
 // offsetof on a class with private, non-trivial members is supported by the compiler for
 // classes without virtual bases; the warning about it is silenced only around the tables.
 #define PYX_DEFINE_MESSAGE(Class)                                                           \
@@ -63,9 +82,15 @@
         static_assert(::pyx::detail::ascendingTags(kFields), "fields in tag order");        \
         static constexpr auto kTagIndex =                                                   \
             ::pyx::detail::buildTagIndex<::pyx::detail::maxTag(kFields) + 1>(kFields);      \
+        static constexpr auto kReadIndex =                                                  \
+            ::pyx::detail::buildReadIndex<::pyx::detail::maxTag(kFields) + 1>(kFields);     \
         static constexpr ::pyx::MessageDescriptor kDescriptor{                              \
-            #Class, kFields, kTagIndex, static_cast<std::uint32_t>(offsetof(Self, has_)),   \
-            ::pyx::detail::unflaggedFields(kFields)};                                       \
+            #Class,                                                                         \
+            kFields,                                                                        \
+            kTagIndex,                                                                      \
+            static_cast<std::uint32_t>(offsetof(Self, has_)),                               \
+            ::pyx::detail::unflaggedFields(kFields),                                        \
+            kReadIndex};                                                                    \
         return kDescriptor;                                                                 \
     }                                                                                       \
     _Pragma("GCC diagnostic pop")

@@ -69,6 +69,9 @@ struct MessageDescriptor {
     // Fields whose presence no bit tells (bytes, text, a nested message, a scalar list): with
     // the bits that are set, an upper bound on the entries of the dictionary form.
     std::uint32_t unflaggedFields;
+    // What the reader looks numbers up in: tagIndex without the fields numbered as metric
+    // tags, which the reader never stores.
+    std::span<const std::uint8_t> readIndex;
 
     static constexpr std::uint8_t kNoField = 0xFF;
 

@@ -223,8 +223,8 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
     // date around everything that goes through it.
     char* const base = static_cast<char*>(message);
     const FieldDescriptor* const fields = d.fields.data();
-    const std::uint8_t* const tagIndex = d.tagIndex.data();
-    const std::size_t tagCount = d.tagIndex.size();
+    const std::uint8_t* const tagIndex = d.readIndex.data();
+    const std::size_t tagCount = d.readIndex.size();
     const std::uint8_t* const bytes = reader.bytes();
     const std::size_t limit = reader.length();
     std::size_t pos = reader.position();
@@ -238,12 +238,6 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
         const auto tag = static_cast<std::uint16_t>(key >> 3);
         if (error || wireType == kWireEndGroup) break;
 
-        if (KBBMetricUtility::isValidMetricIdTag(tag, d)) {
-            const std::uint64_t value = decodeVarint(bytes, pos, limit, error);
-            systemLog(format("Unknown tag: %x:%u", static_cast<unsigned>(tag),
-                             static_cast<unsigned>(value & 0xFFFFFFFFU)));
-            continue;
-        }
         const std::uint8_t index = tag < tagCount ? tagIndex[tag] : MessageDescriptor::kNoField;
         if (index != MessageDescriptor::kNoField && fields[index].isScalar()) {
             // The common case, kept free of a jump table: a varint whatever the wire type,
@@ -261,6 +255,17 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
                 *reinterpret_cast<std::uint32_t*>(p) =
                     f.kind == FieldKind::SInt32 ? static_cast<std::uint32_t>(decodeZigZag32(low))
                                                 : low;
+            }
+            continue;
+        }
+        // The reader's index has no field numbered as a metric tag: only a number it has no
+        // field for can be one, and the fields, the common case, skip the metric-tag table.
+        if (index == MessageDescriptor::kNoField && KBBMetricUtility::isValidMetricIdTag(tag, d)) {
+            const std::uint64_t value = decodeVarint(bytes, pos, limit, error);
+            // The line is built only when the system log is read.
+            if (systemLogSink().on()) {
+                systemLog(format("Unknown tag: %x:%u", static_cast<unsigned>(tag),
+                                 static_cast<unsigned>(value & 0xFFFFFFFFU)));
             }
             continue;
         }
