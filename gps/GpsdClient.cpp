@@ -48,6 +48,10 @@ GpsdClient::~GpsdClient() {
     }
     wake_.notify_all();
     thread_.join();
+    if (const std::uint64_t skipped = malformed_.load(); skipped > 0)
+        systemFault("gps: skipped " + std::to_string(skipped) + " reports from gpsd at " +
+                    options_.address.text() +
+                    " whose position was not one (latitude or longitude out of range)");
 }
 
 bool GpsdClient::pause() {

@@ -5,7 +5,8 @@
 // gpsd absent, stopped or restarted: one line says so, the client tries again every retry
 // interval, and the program goes on without positions meanwhile; one line says when positions
 // come again. Reports without a 2D or 3D fix, or with a position that is not one (latitude
-// beyond ±90°, not a number), are skipped; the latter are counted as malformed.
+// beyond ±90°, not a number), are skipped; the latter are counted as malformed and said in one
+// line when the client stops.
 #pragma once
 
 #include <atomic>
