@@ -13,7 +13,7 @@
 #include "tests/recordings/TempDir.h"
 #include "tests/sources/diag/support/DiagVectors.h"
 #include "tests/sources/diag/transport/WcdmaCapture.h"
-#include "tools/InfoCommand.h"
+#include "tests/tools/InProcess.h"
 
 namespace {
 
@@ -22,20 +22,8 @@ using pyx::Bytes;
 using pyx::testing::TempDir;
 namespace dt = pyx::diag::test;
 
-struct Outcome {
-    int status = 0;
-    std::string out;
-    std::string err;
-};
-
-Outcome info(const std::string& file) {
-    std::ostringstream out, err;
-    Outcome run;
-    run.status = pyx::runInfo(file, out, err);
-    run.out = out.str();
-    run.err = err.str();
-    return run;
-}
+using pyx::test::info;
+using pyx::test::Outcome;
 
 Json logEntry(const Json& object, const std::string& code, int version) {
     for (const auto& entry : object["logs"])

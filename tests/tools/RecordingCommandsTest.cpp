@@ -21,6 +21,7 @@
 #include "tests/recordings/SampleEvents.h"
 #include "tests/recordings/TempDir.h"
 #include "tests/support/ProgramRun.h"
+#include "tests/tools/InProcess.h"
 #include "tools/CsvText.h"
 #include "tools/ExportCommand.h"
 #include "tools/InfoCommand.h"
@@ -87,29 +88,9 @@ void recordSimulatedDrive(const std::string& file, std::size_t count) {
     sim.stopEvents();
 }
 
-struct Outcome {
-    int status = -1;
-    std::string out;
-    std::string err;
-};
-
-Outcome info(const std::string& file) {
-    std::ostringstream out, err;
-    Outcome run;
-    run.status = pyx::runInfo(file, out, err);
-    run.out = out.str();
-    run.err = err.str();
-    return run;
-}
-
-Outcome exportOf(const pyx::ExportRequest& request) {
-    std::ostringstream out, err;
-    Outcome run;
-    run.status = pyx::runExport(request, out, err);
-    run.out = out.str();
-    run.err = err.str();
-    return run;
-}
+using pyx::test::exportOf;
+using pyx::test::info;
+using pyx::test::Outcome;
 
 std::vector<std::string> linesOf(const std::string& text) {
     std::vector<std::string> lines;

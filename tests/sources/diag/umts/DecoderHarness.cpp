@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <fstream>
 #include <iterator>
+#include <string_view>
 #include <variant>
 
 #include "metrics/MetricCatalogue.h"
@@ -68,38 +69,60 @@ void feed(const std::shared_ptr<MetricValidator>& store, const std::vector<Metri
     }
 }
 
+namespace {
+
+// A deterministic source of noise (xorshift32), so that a failing payload comes again.
+class Noise {
+  public:
+    explicit Noise(std::uint32_t seed) : seed_(seed) {}
+    // length bytes; with small, each below limit (where counts and arguments lie).
+    Bytes payload(std::size_t length, bool small, std::uint32_t limit) {
+        Bytes bytes(length);
+        for (std::uint8_t& b : bytes)
+            b = static_cast<std::uint8_t>(small ? next() % limit : next());
+        return bytes;
+    }
+
+  private:
+    std::uint32_t next() {
+        seed_ ^= seed_ << 13;
+        seed_ ^= seed_ >> 17;
+        seed_ ^= seed_ << 5;
+        return seed_;
+    }
+    std::uint32_t seed_;
+};
+
+// Whatever a row wrote must decode as its kind's class.
+void expectDecodable(std::string_view row, const std::vector<MetricOut>& events) {
+    for (const MetricOut& e : events) {
+        const MetricKind* kind = findMetricKind(e.metricID);
+        if (kind == nullptr || !kind->decodable()) {
+            ADD_FAILURE() << row << " wrote an unknown kind " << e.metricID;
+            continue;
+        }
+        EXPECT_TRUE(std::holds_alternative<Dict>(kind->decode(e.payload)))
+            << row << ": " << kind->messageClass;
+    }
+}
+
+}  // namespace
+
 std::size_t feedNoise(std::span<const LogDecoderRow> table) {
-    std::uint32_t seed = 0x2545F491;
-    const auto next = [&] {
-        seed ^= seed << 13;
-        seed ^= seed >> 17;
-        seed ^= seed << 5;
-        return seed;
-    };
+    Noise noise(0x2545F491);
     std::size_t taken = 0;
     DecodeState state;
     for (const LogDecoderRow& row : table) {
         for (std::size_t length = 0; length <= 300; ++length) {
             for (int round = 0; round < 8; ++round) {
-                Bytes payload(length);
                 // Small counts now and then, so that some packets hold all their cells.
-                for (std::uint8_t& b : payload)
-                    b = static_cast<std::uint8_t>(round % 2 == 0 ? next() : next() % 4);
+                Bytes payload = noise.payload(length, round % 2 != 0, 4);
                 if (!payload.empty() && row.version != kAnyVersion)
                     payload[0] = static_cast<std::uint8_t>(row.version);
                 const Decoded d = decode(table, row.code, payload, state);
                 if (!d.decoded) continue;
                 ++taken;
-                for (const MetricOut& e : d.events) {
-                    const MetricKind* kind = findMetricKind(e.metricID);
-                    if (kind == nullptr || !kind->decodable()) {
-                        ADD_FAILURE() << row.name << " wrote an unknown kind " << e.metricID;
-                        continue;
-                    }
-                    const auto decodedEvent = kind->decode(e.payload);
-                    EXPECT_TRUE(std::holds_alternative<Dict>(decodedEvent))
-                        << row.name << ": " << kind->messageClass;
-                }
+                expectDecodable(row.name, d.events);
             }
         }
     }
@@ -172,35 +195,18 @@ Decoded decodeEvent(std::span<const EventDecoderRow> table, std::uint16_t id,
 }
 
 std::size_t feedEventNoise(std::span<const EventDecoderRow> table) {
-    std::uint32_t seed = 0x9E3779B9;
-    const auto next = [&] {
-        seed ^= seed << 13;
-        seed ^= seed >> 17;
-        seed ^= seed << 5;
-        return seed;
-    };
+    Noise noise(0x9E3779B9);
     std::size_t taken = 0;
     DecodeState state;
     for (const EventDecoderRow& row : table) {
         for (std::size_t length = 0; length <= 40; ++length) {
             for (int round = 0; round < 64; ++round) {
-                Bytes payload(length);
                 // Small values now and then, where the rows' arguments lie.
-                for (std::uint8_t& b : payload)
-                    b = static_cast<std::uint8_t>(round % 2 == 0 ? next() : next() % 8);
+                const Bytes payload = noise.payload(length, round % 2 != 0, 8);
                 const Decoded d = decodeEvent(table, row.id, payload, state, kTimeMs + 10U * taken);
                 if (!d.decoded) continue;
                 ++taken;
-                for (const MetricOut& e : d.events) {
-                    const MetricKind* kind = findMetricKind(e.metricID);
-                    if (kind == nullptr || !kind->decodable()) {
-                        ADD_FAILURE() << row.name << " wrote an unknown kind " << e.metricID;
-                        continue;
-                    }
-                    const auto decodedEvent = kind->decode(e.payload);
-                    EXPECT_TRUE(std::holds_alternative<Dict>(decodedEvent))
-                        << row.name << ": " << kind->messageClass;
-                }
+                expectDecodable(row.name, d.events);
             }
         }
     }
