@@ -136,6 +136,11 @@ class Value {
 };
 
 struct DictEntry {
+    DictEntry() = default;
+    // The value is made where the entry is kept (Dict::emplace), from whatever makes a Value.
+    template <class V>
+    DictEntry(std::string k, V&& v) : key(std::move(k)), value(std::forward<V>(v)) {}
+
     std::string key;
     Value value;
     friend bool operator==(const DictEntry& a, const DictEntry& b) = default;
