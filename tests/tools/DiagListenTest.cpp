@@ -15,6 +15,7 @@
 #include "tests/sources/diag/support/DiagVectors.h"
 #include "tests/sources/diag/transport/WcdmaCapture.h"
 #include "tests/support/ProgramRun.h"
+#include "tests/tools/PyxonctlShell.h"
 
 namespace {
 
@@ -23,16 +24,12 @@ using pyx::diag::test::CapturedCell;
 using pyx::test::ProgramRun;
 using pyx::testing::TempDir;
 
-// Runs a shell command line (pyxonctl is $PYXONCTL in it) and collects its output.
 ProgramRun shell(const std::string& commandLine) {
-    return ProgramRun::shell(std::string("PYXONCTL='") + PYXONCTL_PATH + "'; " + commandLine);
+    return pyx::test::pyxonctlShell(commandLine);
 }
 
 std::vector<std::string> lines(const std::string& text) {
-    std::vector<std::string> out;
-    std::istringstream in(text);
-    for (std::string line; std::getline(in, line);) out.push_back(line);
-    return out;
+    return pyx::test::linesOf(text);
 }
 
 // A capture of count WCDMA cells (PSC 1..count), 300 ms apart.

@@ -19,6 +19,7 @@
 #include <vector>
 
 #include "tests/support/ProgramRun.h"
+#include "tests/tools/PyxonctlShell.h"
 #include "tools/RecordReader.h"
 
 namespace {
@@ -26,16 +27,12 @@ namespace {
 using Json = nlohmann::ordered_json;
 using pyx::test::ProgramRun;
 
-// Runs a shell command line (pyxonctl is $PYXONCTL in it) and collects its stdout.
 ProgramRun shell(const std::string& commandLine) {
-    return ProgramRun::shell(std::string("PYXONCTL='") + PYXONCTL_PATH + "'; " + commandLine);
+    return pyx::test::pyxonctlShell(commandLine);
 }
 
 std::vector<std::string> lines(const std::string& text) {
-    std::vector<std::string> out;
-    std::istringstream in(text);
-    for (std::string line; std::getline(in, line);) out.push_back(line);
-    return out;
+    return pyx::test::linesOf(text);
 }
 
 TEST(ListenCommand, PrintsTheAskedCountOfMetricRecordsThatReadBackAsRecords) {

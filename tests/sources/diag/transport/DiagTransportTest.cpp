@@ -132,6 +132,16 @@ DiagTransport::Options captureOptions(const std::string& file, double speed, Col
     return options;
 }
 
+// Pushes a configuration as the start-up does, starts the events and waits for the capture's
+// end; the events are stopped either way. False when the end did not come.
+bool playToEnd(DiagTransport& transport, Collector& collector) {
+    transport.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
+    transport.startEvents(collector.sink());
+    const bool ended = collector.waitForEnd();
+    transport.stopEvents();
+    return ended;
+}
+
 TEST(DiagCapture, AtSpeedZeroEveryPacketsEventsComeInOrderAndTheCaptureEnds) {
     const CapturedLines faults(systemLogSink());
     const TempDir dir;
@@ -166,10 +176,7 @@ TEST(DiagCapture, AtSpeedOneThePacketsComeInTheirOrder) {
 
     Collector collector;
     DiagTransport transport(captureOptions(file, 1, collector));
-    transport.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
-    transport.startEvents(collector.sink());
-    ASSERT_TRUE(collector.waitForEnd());
-    transport.stopEvents();
+    ASSERT_TRUE(playToEnd(transport, collector));
     EXPECT_EQ(collector.pscs(), numbered(1, 4));
 }
 
@@ -228,10 +235,7 @@ TEST(DiagCapture, PacketsWithoutTheModemsClockComeToo) {
 
     Collector collector;
     DiagTransport transport(captureOptions(file, 1, collector));
-    transport.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
-    transport.startEvents(collector.sink());
-    ASSERT_TRUE(collector.waitForEnd());
-    transport.stopEvents();
+    ASSERT_TRUE(playToEnd(transport, collector));
     EXPECT_EQ(collector.pscs(), numbered(1, 3));
 }
 
@@ -273,10 +277,7 @@ TEST(DiagCapture, AFinalFrameCutShortStillEndsCleanly) {
 
     Collector collector;
     DiagTransport transport(captureOptions(file, 0, collector));
-    transport.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
-    transport.startEvents(collector.sink());
-    ASSERT_TRUE(collector.waitForEnd());
-    transport.stopEvents();
+    ASSERT_TRUE(playToEnd(transport, collector));
     EXPECT_EQ(collector.pscs(), numbered(1, 3));
     EXPECT_FALSE(collector.damaged());
     EXPECT_GT(transport.stats().cutShort, 0U);
@@ -303,10 +304,7 @@ TEST(DiagCapture, NoiseAndABadFrameAreCountedAndSkipped) {
 
     Collector collector;
     DiagTransport transport(captureOptions(file, 0, collector));
-    transport.performCommand(velk::kCommandAddConfiguration, configurationInput(), nullptr);
-    transport.startEvents(collector.sink());
-    ASSERT_TRUE(collector.waitForEnd());
-    transport.stopEvents();
+    ASSERT_TRUE(playToEnd(transport, collector));
     EXPECT_EQ(collector.pscs(), numbered(1, 3));
     EXPECT_GE(packetCounts(transport.stats()).badFrames, 1U);
     EXPECT_EQ(packetCounts(transport.stats()).decoded, 3U);
