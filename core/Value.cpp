@@ -5,9 +5,57 @@
 #include <cmath>
 #include <cstring>
 #include <limits>
+#include <memory>
+#include <ostream>
 #include <string_view>
 
 namespace pyx {
+
+void DictKey::copyFrom(std::string_view key) {
+    size_ = static_cast<std::uint32_t>(key.size());
+    if (key.size() <= kInline) {
+        std::memcpy(inline_, key.data(), key.size());
+        data_ = inline_;
+        storage_ = Storage::Inline;
+    } else {
+        heap_ = std::allocator<char>().allocate(key.size());
+        std::memcpy(heap_, key.data(), key.size());
+        data_ = heap_;
+        storage_ = Storage::Heap;
+    }
+}
+
+void DictKey::take(DictKey& other) noexcept {
+    size_ = other.size_;
+    storage_ = other.storage_;
+    switch (storage_) {
+        case Storage::Lasting:
+            data_ = other.data_;
+            break;
+        case Storage::Inline:
+            std::memcpy(inline_, other.inline_, size_);
+            data_ = inline_;
+            break;
+        case Storage::Heap:
+            heap_ = other.heap_;
+            data_ = heap_;
+            break;
+    }
+    other.data_ = "";
+    other.size_ = 0;
+    other.storage_ = Storage::Lasting;
+}
+
+void DictKey::release() noexcept {
+    if (storage_ == Storage::Heap) std::allocator<char>().deallocate(heap_, size_);
+    data_ = "";
+    size_ = 0;
+    storage_ = Storage::Lasting;
+}
+
+std::ostream& operator<<(std::ostream& out, const DictKey& key) {
+    return out << key.view();
+}
 
 Dict::Dict(std::initializer_list<DictEntry> entries) {
     entries_.reserve(entries.size());
@@ -26,7 +74,7 @@ Value* Dict::find(std::string_view key) {
     return nullptr;
 }
 
-Value& Dict::set(std::string key, Value value) {
+Value& Dict::set(DictKey key, Value value) {
     if (Value* existing = find(key)) {
         *existing = std::move(value);
         return *existing;
@@ -34,7 +82,7 @@ Value& Dict::set(std::string key, Value value) {
     return append(std::move(key), std::move(value));
 }
 
-Value& Dict::append(std::string key, Value value) {
+Value& Dict::append(DictKey key, Value value) {
     entries_.push_back(DictEntry{std::move(key), std::move(value)});
     return entries_.back().value;
 }

@@ -8,6 +8,7 @@
 
 #include <cstdint>
 #include <initializer_list>
+#include <iosfwd>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -15,19 +16,98 @@
 #include <variant>
 #include <vector>
 
+#include "core/BlockPool.h"
+
 namespace pyx {
 
 class Value;
 using Bytes = std::vector<std::uint8_t>;
-using Array = std::vector<Value>;
+using Array = std::vector<Value, PoolAllocator<Value>>;
 
 struct DictEntry;
+
+// The key of a dictionary entry. A decoded dictionary takes its keys from the field tables,
+// texts that live as long as the program: such a key is kept by reference (DictKey::lasting),
+// and making, copying and dropping it costs nothing. Any other key is kept as a copy of its own,
+// in the key itself up to 16 characters (as most keys are), else on the heap.
+class DictKey {
+  public:
+    DictKey() = default;
+    DictKey(std::string_view key) { copyFrom(key); }
+    DictKey(const std::string& key) : DictKey(std::string_view(key)) {}
+    DictKey(const char* key) : DictKey(std::string_view(key)) {}
+    // A key whose text outlives every dictionary: a literal, a table's text.
+    static DictKey lasting(std::string_view key) {
+        DictKey k;
+        k.data_ = key.data();
+        k.size_ = key.size();
+        return k;
+    }
+
+    DictKey(const DictKey& other) {
+        if (other.storage_ == Storage::Lasting) {
+            data_ = other.data_;
+            size_ = other.size_;
+        } else {
+            copyFrom(other.view());
+        }
+    }
+    DictKey(DictKey&& other) noexcept { take(other); }
+    DictKey& operator=(const DictKey& other) {
+        if (this != &other) *this = DictKey(other);
+        return *this;
+    }
+    DictKey& operator=(DictKey&& other) noexcept {
+        if (this != &other) {
+            release();
+            take(other);
+        }
+        return *this;
+    }
+    ~DictKey() { release(); }
+
+    [[nodiscard]] std::string_view view() const { return {data_, size_}; }
+    operator std::string_view() const { return view(); }
+    operator std::string() const { return std::string(view()); }
+    [[nodiscard]] std::string str() const { return std::string(view()); }
+    [[nodiscard]] const char* data() const { return data_; }
+    [[nodiscard]] std::size_t size() const { return size_; }
+    [[nodiscard]] bool empty() const { return size_ == 0; }
+
+    friend bool operator==(const DictKey& a, const DictKey& b) { return a.view() == b.view(); }
+    friend bool operator==(const DictKey& a, std::string_view b) { return a.view() == b; }
+    friend bool operator==(const DictKey& a, const std::string& b) { return a.view() == b; }
+    friend bool operator==(const DictKey& a, const char* b) { return a.view() == b; }
+    friend std::string operator+(const std::string& a, const DictKey& b) {
+        return a + std::string(b.view());
+    }
+    friend std::string operator+(const DictKey& a, const std::string& b) {
+        return std::string(a.view()) + b;
+    }
+    friend std::ostream& operator<<(std::ostream& out, const DictKey& key);
+
+  private:
+    enum class Storage : std::uint8_t { Lasting, Inline, Heap };
+    static constexpr std::size_t kInline = 16;
+
+    void copyFrom(std::string_view key);
+    void take(DictKey& other) noexcept;
+    void release() noexcept;
+
+    const char* data_ = "";
+    std::uint32_t size_ = 0;
+    Storage storage_ = Storage::Lasting;
+    union {
+        char inline_[kInline];
+        char* heap_;
+    };
+};
 
 // A dictionary with string keys, in insertion order. Lookups are linear: the system's
 // dictionaries hold a few dozen entries at most, where a scan beats hashing.
 class Dict {
   public:
-    using Entries = std::vector<DictEntry>;
+    using Entries = std::vector<DictEntry, PoolAllocator<DictEntry>>;
     using const_iterator = Entries::const_iterator;
     using iterator = Entries::iterator;
 
@@ -55,14 +135,14 @@ class Dict {
     [[nodiscard]] bool contains(std::string_view key) const { return find(key) != nullptr; }
 
     // Replaces the value of an existing key in place (its position is kept), or appends.
-    Value& set(std::string key, Value value);
+    Value& set(DictKey key, Value value);
     // Appends without looking for an existing key; for builders that know keys are unique.
-    Value& append(std::string key, Value value);
-    // As append, building the entry in place: the key is copied once and the value made
-    // where it is kept, from what the Value would be made of (the decoders build every
-    // dictionary this way: an integer, a text, a list or a dictionary).
+    Value& append(DictKey key, Value value);
+    // As append, building the entry in place: the value is made where it is kept, from what
+    // the Value would be made of (the decoders build every dictionary this way, with keys of
+    // the field tables, DictKey::lasting: an integer, a text, a list or a dictionary).
     template <class V>
-    Value& emplace(std::string_view key, V&& value);
+    Value& emplace(DictKey key, V&& value);
     // Removes the key if present; returns whether it was.
     bool erase(std::string_view key);
     void reserve(std::size_t n);
@@ -139,9 +219,9 @@ struct DictEntry {
     DictEntry() = default;
     // The value is made where the entry is kept (Dict::emplace), from whatever makes a Value.
     template <class V>
-    DictEntry(std::string k, V&& v) : key(std::move(k)), value(std::forward<V>(v)) {}
+    DictEntry(DictKey k, V&& v) : key(std::move(k)), value(std::forward<V>(v)) {}
 
-    std::string key;
+    DictKey key;
     Value value;
     friend bool operator==(const DictEntry& a, const DictEntry& b) = default;
 };
@@ -177,8 +257,8 @@ inline void Dict::reserve(std::size_t n) {
     entries_.reserve(n);
 }
 template <class V>
-inline Value& Dict::emplace(std::string_view key, V&& value) {
-    return entries_.emplace_back(std::string(key), std::forward<V>(value)).value;
+inline Value& Dict::emplace(DictKey key, V&& value) {
+    return entries_.emplace_back(std::move(key), std::forward<V>(value)).value;
 }
 
 // The shortest text that reads back as the same float, always with a decimal point

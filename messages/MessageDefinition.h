@@ -57,16 +57,22 @@
 
 namespace pyx::detail {
 
-// The reader's index: the tag index without the fields numbered as metric tags, which the reader
-// never stores (it takes such a number for a metric tag). With it the reader asks the
+// The reader's slots: the fields by number, without those numbered as metric tags, which the
+// reader never stores (it takes such a number for a metric tag). With them the reader asks the
 // metric-tag table only about the numbers it finds no field for.
 template <std::size_t Size, std::size_t N>
-constexpr std::array<std::uint8_t, Size> buildReadIndex(const FieldDescriptor (&fields)[N]) {
-    std::array<std::uint8_t, Size> index = buildTagIndex<Size>(fields);
-    for (const auto& e : KBBMetricUtility::kEntries) {
-        if (e.tag < Size) index[e.tag] = MessageDescriptor::kNoField;
+constexpr std::array<::pyx::ReadSlot, Size> buildReadSlots(const FieldDescriptor (&fields)[N]) {
+    std::array<::pyx::ReadSlot, Size> slots{};
+    for (auto& slot : slots) slot = {0, 0, ::pyx::ReadSlot::kNoKind, 0, 0};
+    for (std::size_t i = 0; i < N; ++i) {
+        slots[fields[i].tag] = {fields[i].offset, fields[i].bit,
+                                static_cast<std::uint8_t>(fields[i].kind),
+                                static_cast<std::uint8_t>(i), 0};
     }
-    return index;
+    for (const auto& e : KBBMetricUtility::kEntries) {
+        if (e.tag < Size) slots[e.tag].kind = ::pyx::ReadSlot::kNoKind;
+    }
+    return slots;
 }
 
 }  // namespace pyx::detail
@@ -82,15 +88,15 @@ constexpr std::array<std::uint8_t, Size> buildReadIndex(const FieldDescriptor (&
         static_assert(::pyx::detail::ascendingTags(kFields), "fields in tag order");        \
         static constexpr auto kTagIndex =                                                   \
             ::pyx::detail::buildTagIndex<::pyx::detail::maxTag(kFields) + 1>(kFields);      \
-        static constexpr auto kReadIndex =                                                  \
-            ::pyx::detail::buildReadIndex<::pyx::detail::maxTag(kFields) + 1>(kFields);     \
+        static constexpr auto kReadSlots =                                                  \
+            ::pyx::detail::buildReadSlots<::pyx::detail::maxTag(kFields) + 1>(kFields);     \
         static constexpr ::pyx::MessageDescriptor kDescriptor{                              \
             #Class,                                                                         \
             kFields,                                                                        \
             kTagIndex,                                                                      \
             static_cast<std::uint32_t>(offsetof(Self, has_)),                               \
             ::pyx::detail::unflaggedFields(kFields),                                        \
-            kReadIndex};                                                                    \
+            kReadSlots};                                                                    \
         return kDescriptor;                                                                 \
     }                                                                                       \
     _Pragma("GCC diagnostic pop")

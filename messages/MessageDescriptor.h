@@ -12,6 +12,7 @@
 #include <string_view>
 #include <vector>
 
+#include "core/BlockPool.h"
 #include "messages/EnumTable.h"
 
 namespace pyx {
@@ -61,6 +62,23 @@ struct FieldDescriptor {
     [[nodiscard]] constexpr bool isScalar() const { return kind <= FieldKind::Enum; }
 };
 
+// What the reader needs of the field a number names, in eight bytes: one load per field read.
+struct ReadSlot {
+    std::uint32_t offset;
+    std::uint8_t bit;
+    std::uint8_t kind;   // a FieldKind, or kNoKind where the reader stores nothing
+    std::uint8_t index;  // the entry in the field table
+    std::uint8_t unused;
+
+    static constexpr std::uint8_t kNoKind = 0xFF;
+
+    // A plain scalar: the reader's common case.
+    [[nodiscard]] constexpr bool isScalar() const {
+        return kind <= static_cast<std::uint8_t>(FieldKind::Enum);
+    }
+};
+static_assert(sizeof(ReadSlot) == 8);
+
 struct MessageDescriptor {
     std::string_view name;
     std::span<const FieldDescriptor> fields;
@@ -69,9 +87,9 @@ struct MessageDescriptor {
     // Fields whose presence no bit tells (bytes, text, a nested message, a scalar list): with
     // the bits that are set, an upper bound on the entries of the dictionary form.
     std::uint32_t unflaggedFields;
-    // What the reader looks numbers up in: tagIndex without the fields numbered as metric
-    // tags, which the reader never stores.
-    std::span<const std::uint8_t> readIndex;
+    // What the reader looks numbers up in, by field number: the fields without those numbered
+    // as metric tags, which the reader never stores.
+    std::span<const ReadSlot> readSlots;
 
     static constexpr std::uint8_t kNoField = 0xFF;
 
@@ -126,7 +144,7 @@ inline constexpr SubMessageOps kSubMessageOps = {
     [](const void* slot) -> const void* { return static_cast<const Slot<T>*>(slot)->get(); },
     [](void* slot) -> void* {
         auto& s = *static_cast<Slot<T>*>(slot);
-        s = std::make_shared<T>();
+        s = std::allocate_shared<T>(PoolAllocator<T>{});
         return s.get();
     },
     [](void* dst, const void* src) {
@@ -140,7 +158,7 @@ inline constexpr SubMessageOps kSubMessageOps = {
         auto& l = *static_cast<ListSlot<T>*>(list);
         // Lists are short: start at four elements rather than growing through 1, 2 and 4.
         if (l.size() == l.capacity()) l.reserve(l.empty() ? 4 : 2 * l.size());
-        return l.emplace_back(std::make_shared<T>()).get();
+        return l.emplace_back(std::allocate_shared<T>(PoolAllocator<T>{})).get();
     },
     [](void* dst, const void* src, std::size_t i) {
         static_cast<ListSlot<T>*>(dst)->push_back((*static_cast<const ListSlot<T>*>(src))[i]);

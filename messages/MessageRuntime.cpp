@@ -1,7 +1,6 @@
 #include "messages/MessageRuntime.h"
 
 #include <algorithm>
-#include <bit>
 #include <optional>
 #include <string>
 #include <vector>
@@ -119,35 +118,16 @@ void readRepeatedScalar(List& list, std::uint8_t wireType, PBDataReader& reader,
     reader.resumeAfter(packed);
 }
 
-// A nested record, read by a reader of its own over the record's bytes into the message that
-// the caller has already stored (a bad length leaves it in place, empty).
-void readNested(const SubMessageOps& ops, void* nested, PBDataReader& reader) {
-    const auto range = reader.readDelimited();
-    if (!range) return;
-    PBDataReader record = reader.subReader(*range);
-    readMessage(ops.descriptor(), nested, record);
-    reader.resumeAfter(record);
-}
-
-// Every field that is not a plain scalar, on the reader: the length-delimited kinds and the
-// repeated scalars. A failure is left in the reader. Kept out of the reader loop, whose plain
-// scalars are the common case.
+// Bytes, text and the repeated scalars, on the reader; a failure is left in the reader. Kept
+// out of the reader loop, whose plain scalars and nested records are the common case.
 [[gnu::noinline]] void readObjectField(void* message, const FieldDescriptor& f,
-                                       std::uint8_t wireType, std::uint64_t& has,
-                                       PBDataReader& reader) {
+                                       std::uint8_t wireType, PBDataReader& reader) {
     switch (f.kind) {
         case FieldKind::Data:
             at<std::optional<Bytes>>(message, f) = PBReaderReadData(reader);
             break;
         case FieldKind::String:
             at<std::optional<std::string>>(message, f) = PBReaderReadString(reader);
-            break;
-        case FieldKind::Message:
-            readNested(*f.sub, f.sub->makeNew(slot(message, f)), reader);
-            break;
-        case FieldKind::MessageList:
-            has |= std::uint64_t{1} << f.bit;
-            readNested(*f.sub, f.sub->appendNew(slot(message, f)), reader);
             break;
         case FieldKind::UInt32List:
             readRepeatedScalar(at<PBRepeatedUInt32>(message, f), wireType, reader, asUInt32);
@@ -159,6 +139,16 @@ void readNested(const SubMessageOps& ops, void* nested, PBDataReader& reader) {
             break;
     }
 }
+
+// The number of bits set, without the library call std::popcount becomes on the baseline
+// x86-64 the package is built for (no POPCNT instruction).
+constexpr unsigned countBits(std::uint64_t x) {
+    x = x - ((x >> 1) & 0x5555555555555555ULL);
+    x = (x & 0x3333333333333333ULL) + ((x >> 2) & 0x3333333333333333ULL);
+    x = (x + (x >> 4)) & 0x0F0F0F0F0F0F0F0FULL;
+    return static_cast<unsigned>((x * 0x0101010101010101ULL) >> 56);
+}
+static_assert(countBits(0) == 0 && countBits(~0ULL) == 64 && countBits(0x8000000000000101ULL) == 3);
 
 std::uint64_t hashBytes(const void* data, std::size_t size) {
     std::uint64_t h = 0xcbf29ce484222325ULL;
@@ -222,14 +212,16 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
     // storing a field does not make the compiler reload the reader); the reader is brought up to
     // date around everything that goes through it.
     char* const base = static_cast<char*>(message);
-    const FieldDescriptor* const fields = d.fields.data();
-    const std::uint8_t* const tagIndex = d.readIndex.data();
-    const std::size_t tagCount = d.readIndex.size();
+    const ReadSlot* const slots = d.readSlots.data();
+    const std::size_t slotCount = d.readSlots.size();
     const std::uint8_t* const bytes = reader.bytes();
     const std::size_t limit = reader.length();
     std::size_t pos = reader.position();
     bool error = reader.hasError();
     std::uint64_t has = hasBits(d, message);
+    constexpr ReadSlot kNothing{0, 0, ReadSlot::kNoKind, 0, 0};
+    constexpr auto kMessage = static_cast<std::uint8_t>(FieldKind::Message);
+    constexpr auto kMessageList = static_cast<std::uint8_t>(FieldKind::MessageList);
 
     while (pos < limit && !error) {
         const std::size_t keyPosition = pos;
@@ -238,29 +230,30 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
         const auto tag = static_cast<std::uint16_t>(key >> 3);
         if (error || wireType == kWireEndGroup) break;
 
-        const std::uint8_t index = tag < tagCount ? tagIndex[tag] : MessageDescriptor::kNoField;
-        if (index != MessageDescriptor::kNoField && fields[index].isScalar()) {
+        const ReadSlot s = tag < slotCount ? slots[tag] : kNothing;
+        if (s.isScalar()) {
             // The common case, kept free of a jump table: a varint whatever the wire type,
             // stored at the field's width.
-            const FieldDescriptor& f = fields[index];
             const std::uint64_t v = decodeVarint(bytes, pos, limit, error);
-            has |= std::uint64_t{1} << f.bit;
-            char* const p = base + f.offset;
-            if (f.kind == FieldKind::UInt64) {
+            has |= std::uint64_t{1} << s.bit;
+            char* const p = base + s.offset;
+            if (s.kind == static_cast<std::uint8_t>(FieldKind::UInt64)) {
                 *reinterpret_cast<std::uint64_t*>(p) = v;
-            } else if (f.kind == FieldKind::Bool) {
+            } else if (s.kind == static_cast<std::uint8_t>(FieldKind::Bool)) {
                 *reinterpret_cast<bool*>(p) = v != 0;
             } else {
                 const auto low = static_cast<std::uint32_t>(v);
                 *reinterpret_cast<std::uint32_t*>(p) =
-                    f.kind == FieldKind::SInt32 ? static_cast<std::uint32_t>(decodeZigZag32(low))
-                                                : low;
+                    s.kind == static_cast<std::uint8_t>(FieldKind::SInt32)
+                        ? static_cast<std::uint32_t>(decodeZigZag32(low))
+                        : low;
             }
             continue;
         }
-        // The reader's index has no field numbered as a metric tag: only a number it has no
+        // The reader's slots have no field numbered as a metric tag: only a number it has no
         // field for can be one, and the fields, the common case, skip the metric-tag table.
-        if (index == MessageDescriptor::kNoField && KBBMetricUtility::isValidMetricIdTag(tag, d)) {
+        const bool noField = s.kind == ReadSlot::kNoKind;
+        if (noField && KBBMetricUtility::isValidMetricIdTag(tag, d)) {
             const std::uint64_t value = decodeVarint(bytes, pos, limit, error);
             // The line is built only when the system log is read.
             if (systemLogSink().on()) {
@@ -269,11 +262,35 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
             }
             continue;
         }
-        reader.setPosition(pos);
-        if (index == MessageDescriptor::kNoField) {
+        if (s.kind == kMessage || s.kind == kMessageList) {
+            // A nested record: the message is made (and a list marked created) before its
+            // length is read, so a bad length leaves it in place, empty. The record is read by
+            // a reader of its own on the same bytes, up to its end or an end-of-group key.
+            const SubMessageOps& ops = *d.fields[s.index].sub;
+            void* nested = nullptr;
+            if (s.kind == kMessageList) {
+                has |= std::uint64_t{1} << s.bit;
+                nested = ops.appendNew(base + s.offset);
+            } else {
+                nested = ops.makeNew(base + s.offset);
+            }
+            const std::size_t lengthPosition = pos;
+            const std::uint64_t size = decodeVarint(bytes, pos, limit, error);
+            if (error) break;
+            if (size > limit - pos) {
+                reader.fail(DecodeError::Reason::LengthPastEnd, lengthPosition);
+                error = true;
+                break;
+            }
+            PBDataReader record = reader.record(pos, pos + static_cast<std::size_t>(size));
+            readMessage(ops.descriptor(), nested, record);
+            reader.resumeAfter(record);
+        } else if (noField) {
+            reader.setPosition(pos);
             PBReaderSkipValueWithTag(reader, tag, wireType, keyPosition);
         } else {
-            readObjectField(message, fields[index], wireType, has, reader);
+            reader.setPosition(pos);
+            readObjectField(message, d.fields[s.index], wireType, reader);
         }
         pos = reader.position();
         error = reader.hasError();
@@ -360,39 +377,44 @@ Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
     // Room for what can be present, not for every field: a dictionary of a few entries stays
     // a small allocation.
     dict.reserve(std::min<std::size_t>(
-        d.fields.size(), static_cast<std::size_t>(std::popcount(has)) + d.unflaggedFields));
+        d.fields.size(), static_cast<std::size_t>(countBits(has)) + d.unflaggedFields));
     for (const FieldDescriptor& f : d.fields) {
         switch (f.kind) {
             case FieldKind::UInt64:
-                if (isSet(has, f)) dict.emplace(f.key, at<std::uint64_t>(message, f));
+                if (isSet(has, f))
+                    dict.emplace(DictKey::lasting(f.key), at<std::uint64_t>(message, f));
                 break;
             case FieldKind::UInt32:
-                if (isSet(has, f)) dict.emplace(f.key, at<std::uint32_t>(message, f));
+                if (isSet(has, f))
+                    dict.emplace(DictKey::lasting(f.key), at<std::uint32_t>(message, f));
                 break;
             case FieldKind::SInt32:
-                if (isSet(has, f)) dict.emplace(f.key, at<std::int32_t>(message, f));
+                if (isSet(has, f))
+                    dict.emplace(DictKey::lasting(f.key), at<std::int32_t>(message, f));
                 break;
             case FieldKind::Bool:
-                if (isSet(has, f)) dict.emplace(f.key, at<bool>(message, f));
+                if (isSet(has, f)) dict.emplace(DictKey::lasting(f.key), at<bool>(message, f));
                 break;
             case FieldKind::Enum:
                 if (isSet(has, f)) {
-                    dict.emplace(f.key, f.enumTable->nameOf(at<std::int32_t>(message, f)));
+                    dict.emplace(DictKey::lasting(f.key),
+                                 f.enumTable->nameOf(at<std::int32_t>(message, f)));
                 }
                 break;
             case FieldKind::Data:
                 if (const auto& v = at<std::optional<Bytes>>(message, f)) {
-                    dict.emplace(f.key, *v);
+                    dict.emplace(DictKey::lasting(f.key), *v);
                 }
                 break;
             case FieldKind::String:
                 if (const auto& v = at<std::optional<std::string>>(message, f)) {
-                    dict.emplace(f.key, *v);
+                    dict.emplace(DictKey::lasting(f.key), *v);
                 }
                 break;
             case FieldKind::Message:
                 if (const void* nested = f.sub->get(slot(message, f))) {
-                    dict.emplace(f.key, dictionaryOf(f.sub->descriptor(), nested));
+                    dict.emplace(DictKey::lasting(f.key),
+                                 dictionaryOf(f.sub->descriptor(), nested));
                 }
                 break;
             case FieldKind::MessageList: {
@@ -404,14 +426,16 @@ Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
                 const MessageDescriptor& nd = f.sub->descriptor();
                 for (std::size_t i = 0; i < n; ++i)
                     values.emplace_back(dictionaryOf(nd, f.sub->at(list, i)));
-                dict.emplace(f.key, std::move(values));
+                dict.emplace(DictKey::lasting(f.key), std::move(values));
                 break;
             }
             case FieldKind::UInt32List:
-                dict.emplace(f.key, PBRepeatedUInt32NSArray(at<PBRepeatedUInt32>(message, f)));
+                dict.emplace(DictKey::lasting(f.key),
+                             PBRepeatedUInt32NSArray(at<PBRepeatedUInt32>(message, f)));
                 break;
             case FieldKind::SInt32List:
-                dict.emplace(f.key, PBRepeatedInt32NSArray(at<PBRepeatedInt32>(message, f)));
+                dict.emplace(DictKey::lasting(f.key),
+                             PBRepeatedInt32NSArray(at<PBRepeatedInt32>(message, f)));
                 break;
         }
     }

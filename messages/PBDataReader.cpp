@@ -6,21 +6,15 @@ namespace pyx {
 
 using Reason = DecodeError::Reason;
 
-std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
-                               bool& error) {
-    const std::size_t start = pos;
+VarintTail decodeVarintTail(const std::uint8_t* p, std::size_t available) {
     std::uint64_t value = 0;
-    for (unsigned i = 0; i < 10; ++i) {
-        if (pos >= limit) {
-            error = true;
-            pos = start;
-            return 0;
-        }
-        const std::uint8_t byte = bytes[pos++];
+    for (std::size_t i = 0; i < 10; ++i) {
+        if (i >= available) return {0, 0};
+        const std::uint8_t byte = p[i];
         value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
-        if ((byte & 0x80) == 0) return value;
+        if ((byte & 0x80) == 0) return {value, i + 1};
     }
-    return 0;
+    return {0, 10};
 }
 
 namespace {

@@ -58,6 +58,14 @@ class PBDataReader {
         sub.origin_ = origin_ + static_cast<std::size_t>(range.data() - bytes_);
         return sub;
     }
+    // A reader for the nested record [begin, end) of this reader's record, on the same bytes:
+    // its positions and failures count from the same first byte, so that resumeAfter takes it
+    // back as it takes a sub-reader. For a reader that has no failure.
+    // (Built field by field: a copy of the whole reader would load its position right after
+    // the caller stored it, and stall on the store.)
+    [[nodiscard]] PBDataReader record(std::size_t begin, std::size_t end) const {
+        return PBDataReader(bytes_, end, begin, origin_);
+    }
     // Takes back a finished sub-reader: reading goes on from where it stopped (the end of its
     // range, or earlier at an end-of-group key), and its failure becomes this reader's.
     void resumeAfter(const PBDataReader& sub) {
@@ -66,6 +74,9 @@ class PBDataReader {
     }
 
   private:
+    PBDataReader(const std::uint8_t* bytes, std::size_t length, std::size_t pos, std::size_t origin)
+        : bytes_(bytes), length_(length), pos_(pos), origin_(origin) {}
+
     const std::uint8_t* bytes_;
     std::size_t length_;
     std::size_t pos_ = 0;
@@ -73,13 +84,20 @@ class PBDataReader {
     std::optional<DecodeError> error_;
 };
 
+// A varint of three bytes or more, or one that runs past the end, read from `available` bytes
+// at p: its value and its length in bytes (0 when it runs past the end; ten bytes without a
+// final byte give the value 0). Out of line, and it takes no reference: a caller's position
+// stays in a register.
+struct VarintTail {
+    std::uint64_t value;
+    std::size_t size;
+};
+VarintTail decodeVarintTail(const std::uint8_t* p, std::size_t available);
+
 // The varint decoder behind PBDataReader::readVarint, on a position and limit held by the
 // caller. A varint that runs past the limit sets error, gives 0 and leaves pos at its first
-// byte (where the failure is reported).
-std::uint64_t decodeVarintSlow(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
-                               bool& error);
-
-// One- and two-byte values (keys, most field values) take no loop.
+// byte (where the failure is reported). One- and two-byte values (keys, most field values)
+// take no loop.
 inline std::uint64_t decodeVarint(const std::uint8_t* bytes, std::size_t& pos, std::size_t limit,
                                   bool& error) {
     if (limit - pos >= 2) {
@@ -96,7 +114,13 @@ inline std::uint64_t decodeVarint(const std::uint8_t* bytes, std::size_t& pos, s
     } else if (pos < limit && bytes[pos] < 0x80) {
         return bytes[pos++];
     }
-    return decodeVarintSlow(bytes, pos, limit, error);
+    const VarintTail tail = decodeVarintTail(bytes + pos, limit - pos);
+    if (tail.size == 0) {
+        error = true;
+        return 0;
+    }
+    pos += tail.size;
+    return tail.value;
 }
 
 inline std::uint64_t PBDataReader::readVarint() {

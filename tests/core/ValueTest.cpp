@@ -3,6 +3,9 @@
 #include <gtest/gtest.h>
 
 #include <limits>
+#include <sstream>
+#include <string>
+#include <string_view>
 
 using pyx::Array;
 using pyx::Bytes;
@@ -82,6 +85,58 @@ TEST(ValueDict, EmplaceAppendsAnEntryBuiltInPlace) {
     EXPECT_EQ(
         d,
         (Dict{{"a", Value(1)}, {longKey, Value(Array{Value(2), Value(3)})}, {"b", Value("text")}}));
+}
+
+TEST(ValueDictKey, ALastingKeyIsTheTableTextItself) {
+    static constexpr std::string_view kTableKey = "mo_signalling_ac_barring_for_special_ac";
+    const pyx::DictKey key = pyx::DictKey::lasting(kTableKey);
+    EXPECT_EQ(key.data(), kTableKey.data());
+    const pyx::DictKey copy = key;  // NOLINT(performance-unnecessary-copy-initialization)
+    EXPECT_EQ(copy.data(), kTableKey.data());
+    Dict d;
+    d.emplace(pyx::DictKey::lasting(kTableKey), Value(1));
+    const Dict copied = d;  // NOLINT(performance-unnecessary-copy-initialization)
+    EXPECT_EQ(copied.at(0).key.data(), kTableKey.data());
+    EXPECT_EQ(copied.at(0).key, kTableKey);
+}
+
+TEST(ValueDictKey, AnyOtherKeyIsACopyOfItsOwn) {
+    for (const std::string text : {"", "pci", "sixteen_chars_16", "seventeen_chars_17",
+                                   "mo_signalling_ac_barring_for_special_ac"}) {
+        std::string source = text;
+        pyx::DictKey key(source);
+        source.assign(source.size(), '#');  // the key does not follow its source
+        EXPECT_EQ(key, text);
+        EXPECT_EQ(key.size(), text.size());
+        pyx::DictKey copy = key;
+        EXPECT_EQ(copy, text);
+        if (!text.empty()) {
+            EXPECT_NE(copy.data(), key.data());
+        }
+        pyx::DictKey moved = std::move(copy);
+        EXPECT_EQ(moved, text);
+        pyx::DictKey assigned("x");
+        assigned = moved;
+        EXPECT_EQ(assigned, text);
+        assigned = pyx::DictKey("a key long enough for the heap");
+        EXPECT_EQ(assigned, "a key long enough for the heap");
+        assigned = std::move(moved);
+        EXPECT_EQ(assigned, text);
+        EXPECT_EQ(std::string(assigned), text);
+    }
+}
+
+TEST(ValueDictKey, ComparesAndPrintsAsItsText) {
+    const pyx::DictKey key("rsrp0");
+    EXPECT_TRUE(key == "rsrp0");
+    EXPECT_TRUE(key == std::string("rsrp0"));
+    EXPECT_TRUE(key == std::string_view("rsrp0"));
+    EXPECT_TRUE(key == pyx::DictKey::lasting("rsrp0"));
+    EXPECT_FALSE(key == "rsrp1");
+    std::ostringstream out;
+    out << key;
+    EXPECT_EQ(out.str(), "rsrp0");
+    EXPECT_EQ("inst_values." + std::string(key), "inst_values.rsrp0");
 }
 
 TEST(ValueDict, EqualityIsOrderSensitive) {
