@@ -25,32 +25,8 @@ void DictKey::copyFrom(std::string_view key) {
     }
 }
 
-void DictKey::take(DictKey& other) noexcept {
-    size_ = other.size_;
-    storage_ = other.storage_;
-    switch (storage_) {
-        case Storage::Lasting:
-            data_ = other.data_;
-            break;
-        case Storage::Inline:
-            std::memcpy(inline_, other.inline_, size_);
-            data_ = inline_;
-            break;
-        case Storage::Heap:
-            heap_ = other.heap_;
-            data_ = heap_;
-            break;
-    }
-    other.data_ = "";
-    other.size_ = 0;
-    other.storage_ = Storage::Lasting;
-}
-
-void DictKey::release() noexcept {
-    if (storage_ == Storage::Heap) std::allocator<char>().deallocate(heap_, size_);
-    data_ = "";
-    size_ = 0;
-    storage_ = Storage::Lasting;
+void DictKey::freeHeap() noexcept {
+    std::allocator<char>().deallocate(heap_, size_);
 }
 
 std::ostream& operator<<(std::ostream& out, const DictKey& key) {
@@ -227,14 +203,22 @@ void writeBytes(DescriptionWriter& w, const Bytes& bytes) {
 
 void writeValue(DescriptionWriter& w, const Value& value);
 
+// Two characters, without a call to memcpy for them.
+void putPair(DescriptionWriter& w, char a, char b) {
+    char* const p = w.room(2);
+    p[0] = a;
+    p[1] = b;
+    w.commit(p + 2);
+}
+
 void writeDict(DescriptionWriter& w, const Dict& dict) {
     w.put('{');
     bool first = true;
     for (const auto& [key, value] : dict) {
-        if (!first) w.put(std::string_view(", "));
+        if (!first) putPair(w, ',', ' ');
         first = false;
-        w.put(key);
-        w.put(std::string_view(": "));
+        w.put(key.view());
+        putPair(w, ':', ' ');
         writeValue(w, value);
     }
     w.put('}');
@@ -267,7 +251,7 @@ void writeValue(DescriptionWriter& w, const Value& value) {
             w.put('[');
             bool first = true;
             for (const auto& v : value.asArray()) {
-                if (!first) w.put(std::string_view(", "));
+                if (!first) putPair(w, ',', ' ');
                 first = false;
                 writeValue(w, v);
             }

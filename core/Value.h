@@ -7,6 +7,7 @@
 #pragma once
 
 #include <cstdint>
+#include <cstring>
 #include <initializer_list>
 #include <iosfwd>
 #include <optional>
@@ -91,8 +92,31 @@ class DictKey {
     static constexpr std::size_t kInline = 16;
 
     void copyFrom(std::string_view key);
-    void take(DictKey& other) noexcept;
-    void release() noexcept;
+    void freeHeap() noexcept;
+    // Moves and drops are in every dictionary's building and copying: inline, and nothing more
+    // than a few stores for a lasting key.
+    void take(DictKey& other) noexcept {
+        size_ = other.size_;
+        storage_ = other.storage_;
+        if (storage_ == Storage::Lasting) {
+            data_ = other.data_;
+        } else if (storage_ == Storage::Inline) {
+            std::memcpy(inline_, other.inline_, kInline);
+            data_ = inline_;
+        } else {
+            heap_ = other.heap_;
+            data_ = heap_;
+        }
+        other.data_ = "";
+        other.size_ = 0;
+        other.storage_ = Storage::Lasting;
+    }
+    void release() noexcept {
+        if (storage_ == Storage::Heap) freeHeap();
+        data_ = "";
+        size_ = 0;
+        storage_ = Storage::Lasting;
+    }
 
     const char* data_ = "";
     std::uint32_t size_ = 0;

@@ -45,6 +45,8 @@ struct SubMessageOps {
     std::size_t (*count)(const void* list);
     const void* (*at)(const void* list, std::size_t index);
     void* (*appendNew)(void* list);
+    // Room for n elements in all, for a reader that knows how many records follow.
+    void (*reserve)(void* list, std::size_t n);
     void (*appendShared)(void* dstList, const void* srcList, std::size_t index);
     void (*clear)(void* list);
 };
@@ -160,6 +162,7 @@ inline constexpr SubMessageOps kSubMessageOps = {
         if (l.size() == l.capacity()) l.reserve(l.empty() ? 4 : 2 * l.size());
         return l.emplace_back(std::allocate_shared<T>(PoolAllocator<T>{})).get();
     },
+    [](void* list, std::size_t n) { static_cast<ListSlot<T>*>(list)->reserve(n); },
     [](void* dst, const void* src, std::size_t i) {
         static_cast<ListSlot<T>*>(dst)->push_back((*static_cast<const ListSlot<T>*>(src))[i]);
     },

@@ -118,6 +118,34 @@ void readRepeatedScalar(List& list, std::uint8_t wireType, PBDataReader& reader,
     reader.resumeAfter(packed);
 }
 
+// How many length-delimited records follow one another from `at` under the same key (of
+// keySize bytes) as the one there, up to the first other key, a bad length or the end: the
+// elements a list is about to get, so that it is given its room once rather than growing
+// through 4, 8, 16... A repeated field comes in one run as writers write it; if it does not,
+// the list grows from there as before.
+std::size_t recordsInARow(const std::uint8_t* bytes, std::size_t at, std::size_t keySize,
+                          std::size_t limit) {
+    constexpr std::size_t kMost = 1024;
+    const std::uint8_t* const key = bytes + at;
+    std::size_t n = 0;
+    std::size_t pos = at;
+    const auto sameKey = [&](std::size_t from) {
+        for (std::size_t i = 0; i < keySize; ++i) {
+            if (bytes[from + i] != key[i]) return false;
+        }
+        return true;
+    };
+    while (n < kMost && limit - pos > keySize && sameKey(pos)) {
+        pos += keySize;
+        bool error = false;
+        const std::uint64_t size = decodeVarint(bytes, pos, limit, error);
+        if (error || size > limit - pos) break;
+        pos += static_cast<std::size_t>(size);
+        ++n;
+    }
+    return n > 0 ? n : 1;
+}
+
 // Bytes, text and the repeated scalars, on the reader; a failure is left in the reader. Kept
 // out of the reader loop, whose plain scalars and nested records are the common case.
 [[gnu::noinline]] void readObjectField(void* message, const FieldDescriptor& f,
@@ -270,7 +298,11 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
             void* nested = nullptr;
             if (s.kind == kMessageList) {
                 has |= std::uint64_t{1} << s.bit;
-                nested = ops.appendNew(base + s.offset);
+                void* const list = base + s.offset;
+                if (ops.count(list) == 0) {
+                    ops.reserve(list, recordsInARow(bytes, keyPosition, pos - keyPosition, limit));
+                }
+                nested = ops.appendNew(list);
             } else {
                 nested = ops.makeNew(base + s.offset);
             }
