@@ -8,6 +8,7 @@
 #include <exception>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <thread>
 
@@ -53,19 +54,45 @@ void account(benchmark::State& state, const Subject& subject) {
         static_cast<double>(bytes) / static_cast<double>(subject.records.size());
 }
 
+// Both line sinks muted while it lives, as in pyxonctl without -v: no line is built.
+class MutedSinks {
+  public:
+    MutedSinks() {
+        standardOutputSink().mute(true);
+        systemLogSink().mute(true);
+    }
+    ~MutedSinks() {
+        standardOutputSink().mute(false);
+        systemLogSink().mute(false);
+    }
+    MutedSinks(const MutedSinks&) = delete;
+    MutedSinks& operator=(const MutedSinks&) = delete;
+};
+
+// What the intake's lines cost is part of "intake/ours/..." and out of "intake/quiet/...".
+enum class IntakeMode {
+    Read,     // "ours": the lines are built and taken (the window, --headless)
+    Quiet,    // "quiet": the sinks muted, nobody reads the lines (pyxonctl without -v)
+    History,  // "history": as ours, and the store feeds the charts' history
+};
+
 // Record to stored dictionary: dispatch, decode, dictionary, timestamp text, conversions,
 // holders and the arrival line, on a store of its own; as "intake/history/..." the store also
 // feeds the charts' history, to compare with "intake/ours/...". (The corpus replays the same
 // times on every pass, so the history starts a new session at each pass, as for a replay: its
 // series stay nearly empty. "history/ours/..." measures it full.)
-void registerIntake(const Subject& subject, bool withHistory) {
-    const std::string side = withHistory ? "history" : "ours";
+void registerIntake(const Subject& subject, IntakeMode mode) {
+    const char* const side = mode == IntakeMode::Read    ? "ours"
+                             : mode == IntakeMode::Quiet ? "quiet"
+                                                         : "history";
     benchmark::RegisterBenchmark(
-        ("intake/" + side + "/" + subject.name).c_str(),
-        [subject, withHistory](benchmark::State& state) {
+        ("intake/" + std::string(side) + "/" + subject.name).c_str(),
+        [subject, mode](benchmark::State& state) {
             const SilencedSinks silenced;
+            std::optional<MutedSinks> muted;
+            if (mode == IntakeMode::Quiet) muted.emplace();
             const auto validator = MetricValidator::create(nullptr);
-            if (withHistory) validator->setHistory(std::make_shared<History>());
+            if (mode == IntakeMode::History) validator->setHistory(std::make_shared<History>());
             for (auto _ : state) {
                 for (const CorpusRecord* r : subject.records) {
                     if (!validator->isMetricIDValidWithMetricdict(r->record)) {
@@ -254,10 +281,12 @@ void registerScreen(const std::vector<CorpusRecord>& corpus) {
 
 void registerIntakeBenchmarks(const std::vector<CorpusRecord>& corpus) {
     const std::vector<Subject> subjects = subjectsOf(corpus);
-    for (const Subject& subject : subjects) registerIntake(subject, false);
-    // With the history: the realistic mix and the whole corpus (the last two subjects).
+    for (const Subject& subject : subjects) registerIntake(subject, IntakeMode::Read);
+    // Quiet and with the history: the realistic mix and the whole corpus (the last two
+    // subjects).
     for (std::size_t i = subjects.size() >= 2 ? subjects.size() - 2 : 0; i < subjects.size(); ++i) {
-        registerIntake(subjects[i], true);
+        registerIntake(subjects[i], IntakeMode::Quiet);
+        registerIntake(subjects[i], IntakeMode::History);
         registerHistory(subjects[i]);
     }
     registerPath(subjects.back());  // the whole corpus

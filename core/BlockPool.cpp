@@ -1,45 +1,10 @@
 #include "core/BlockPool.h"
 
-#include <cstdint>
+namespace pyx::pool {
 
-#if defined(__SANITIZE_ADDRESS__)
-#define PYX_POOL_BYPASSED 1
-#elif defined(__has_feature)
-#if __has_feature(address_sanitizer)
-#define PYX_POOL_BYPASSED 1
-#endif
-#endif
-
-namespace pyx {
+thread_local FreeLists tLists{};
 
 namespace {
-
-constexpr std::size_t kGranule = 16;
-constexpr std::size_t kLargestPooled = 1024;
-constexpr std::size_t kClasses = kLargestPooled / kGranule;
-// What one list may keep, in bytes: a few lists of forty neighbours of every size.
-constexpr std::size_t kKeptBytesPerClass = 64 * 1024;
-
-constexpr std::size_t classOf(std::size_t bytes) {
-    return (bytes + kGranule - 1) / kGranule - 1;
-}
-constexpr std::size_t blockSizeOf(std::size_t sizeClass) {
-    return (sizeClass + 1) * kGranule;
-}
-
-struct FreeBlock {
-    FreeBlock* next;
-};
-
-// The lists of one thread. Plain data, so that it can still be asked after the thread's
-// clean-up has run (a block let go by a thread-local object destroyed later goes to the heap).
-struct FreeLists {
-    FreeBlock* head[kClasses];
-    std::uint32_t count[kClasses];
-    bool started;   // the clean-up is registered
-    bool finished;  // the clean-up has run: lists are no longer kept
-};
-thread_local FreeLists tLists{};
 
 void drain(FreeLists& lists) noexcept {
     for (std::size_t c = 0; c < kClasses; ++c) {
@@ -71,44 +36,38 @@ void registerCleanUp() {
 
 #ifdef PYX_POOL_BYPASSED
 
-void* poolAllocate(std::size_t bytes) {
+void* allocateSlow(std::size_t bytes) {
     return ::operator new(bytes);
 }
 
-void poolRelease(void* block, std::size_t bytes) noexcept {
+void releaseSlow(void* block, std::size_t bytes) noexcept {
     ::operator delete(block, bytes);
 }
 
 #else
 
-void* poolAllocate(std::size_t bytes) {
-    if (bytes == 0 || bytes > kLargestPooled) {
-        return ::operator new(bytes);
-    }
+// A pooled size is taken from the heap at its class's full size, so that any block of the
+// class can serve any request of it later.
+void* allocateSlow(std::size_t bytes) {
     const std::size_t c = classOf(bytes);
-    FreeLists& lists = tLists;
-    if (FreeBlock* block = lists.head[c]) {
-        lists.head[c] = block->next;
-        --lists.count[c];
-        return block;
-    }
-    if (!lists.started) registerCleanUp();
+    if (c >= kClasses) return ::operator new(bytes);
+    if (!tLists.started) registerCleanUp();
     return ::operator new(blockSizeOf(c));
 }
 
-void poolRelease(void* block, std::size_t bytes) noexcept {
-    if (bytes == 0 || bytes > kLargestPooled) {
+void releaseSlow(void* block, std::size_t bytes) noexcept {
+    const std::size_t c = classOf(bytes);
+    if (c >= kClasses) {
         ::operator delete(block, bytes);
         return;
     }
-    const std::size_t c = classOf(bytes);
     FreeLists& lists = tLists;
     if (!lists.started) registerCleanUp();
     if (lists.finished || lists.count[c] >= kKeptBytesPerClass / blockSizeOf(c)) {
         ::operator delete(block, blockSizeOf(c));
         return;
     }
-    auto* freed = static_cast<FreeBlock*>(block);
+    auto* const freed = static_cast<FreeBlock*>(block);
     freed->next = lists.head[c];
     lists.head[c] = freed;
     ++lists.count[c];
@@ -116,4 +75,4 @@ void poolRelease(void* block, std::size_t bytes) noexcept {
 
 #endif
 
-}  // namespace pyx
+}  // namespace pyx::pool

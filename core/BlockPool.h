@@ -2,7 +2,7 @@
 // makes one of each for every nested record, and the store drops them by the thousand a second;
 // with malloc each took a trip through glibc's bins (its per-thread cache keeps only seven blocks
 // of a size, and a list of forty neighbours overflows it). Here each thread keeps free lists of
-// its own, one per size class of 16 bytes up to 1 KiB, and a block goes back to the list of the
+// its own, one per size class of 16 bytes up to 4 KiB, and a block goes back to the list of the
 // thread that lets it go. Every list is capped, so memory stays flat whichever thread makes and
 // whichever drops; the rest goes back to the heap.
 //
@@ -10,15 +10,91 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <new>
+
+#if defined(__SANITIZE_ADDRESS__)
+#define PYX_POOL_BYPASSED 1
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define PYX_POOL_BYPASSED 1
+#endif
+#endif
 
 namespace pyx {
 
+namespace pool {
+
+inline constexpr std::size_t kGranule = 16;
+inline constexpr std::size_t kLargestPooled = 4096;
+inline constexpr std::size_t kClasses = kLargestPooled / kGranule;
+// What one list may keep, in bytes: a few lists of forty neighbours of every size.
+inline constexpr std::size_t kKeptBytesPerClass = 64 * 1024;
+
+struct FreeBlock {
+    FreeBlock* next;
+};
+
+// The lists of one thread. Plain data, so that it can still be asked after the thread's
+// clean-up has run (a block let go by a thread-local object destroyed later goes to the heap).
+struct FreeLists {
+    FreeBlock* head[kClasses];
+    std::uint32_t count[kClasses];
+    bool started;   // the clean-up is registered
+    bool finished;  // the clean-up has run: lists are no longer kept
+};
+extern thread_local FreeLists tLists;
+
+// The size class of a block of 1 to kLargestPooled bytes; kClasses or more for any other size.
+inline std::size_t classOf(std::size_t bytes) {
+    return (bytes - 1) / kGranule;
+}
+inline constexpr std::size_t blockSizeOf(std::size_t sizeClass) {
+    return (sizeClass + 1) * kGranule;
+}
+
+// What the inline paths below leave to the library: an empty list, a full one, a thread
+// without its clean-up yet, a size that is not pooled.
+void* allocateSlow(std::size_t bytes);
+void releaseSlow(void* block, std::size_t bytes) noexcept;
+
+}  // namespace pool
+
 // A block of at least `bytes` bytes, aligned as operator new aligns (16 bytes). Throws
 // std::bad_alloc as operator new does.
-[[nodiscard]] void* poolAllocate(std::size_t bytes);
+[[nodiscard]] inline void* poolAllocate(std::size_t bytes) {
+#ifndef PYX_POOL_BYPASSED
+    const std::size_t c = pool::classOf(bytes);
+    if (c < pool::kClasses) {
+        pool::FreeLists& lists = pool::tLists;
+        if (pool::FreeBlock* block = lists.head[c]) {
+            lists.head[c] = block->next;
+            --lists.count[c];
+            return block;
+        }
+    }
+#endif
+    return pool::allocateSlow(bytes);
+}
+
 // Gives back a block from poolAllocate of the same size.
-void poolRelease(void* block, std::size_t bytes) noexcept;
+inline void poolRelease(void* block, std::size_t bytes) noexcept {
+#ifndef PYX_POOL_BYPASSED
+    const std::size_t c = pool::classOf(bytes);
+    if (c < pool::kClasses) {
+        pool::FreeLists& lists = pool::tLists;
+        if (lists.started && !lists.finished &&
+            lists.count[c] < pool::kKeptBytesPerClass / pool::blockSizeOf(c)) {
+            auto* const freed = static_cast<pool::FreeBlock*>(block);
+            freed->next = lists.head[c];
+            lists.head[c] = freed;
+            ++lists.count[c];
+            return;
+        }
+    }
+#endif
+    pool::releaseSlow(block, bytes);
+}
 
 // The allocator of pooled blocks: std::allocate_shared takes it for a nested message (its
 // object and its counts in one block), a dictionary for its entries.

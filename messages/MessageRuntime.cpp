@@ -403,9 +403,12 @@ void writeMessage(const MessageDescriptor& d, const void* message, PBDataWriter&
     }
 }
 
-Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
+namespace {
+
+// The dictionary form written into an empty dictionary where it is kept: a nested message's
+// dictionary is made in its place in the parent (or in the list), not returned and moved there.
+void fillDictionary(const MessageDescriptor& d, const void* message, Dict& dict) {
     const std::uint64_t has = hasBits(d, message);
-    Dict dict;
     // Room for what can be present, not for every field: a dictionary of a few entries stays
     // a small allocation.
     dict.reserve(std::min<std::size_t>(
@@ -445,20 +448,19 @@ Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
                 break;
             case FieldKind::Message:
                 if (const void* nested = f.sub->get(slot(message, f))) {
-                    dict.emplace(DictKey::lasting(f.key),
-                                 dictionaryOf(f.sub->descriptor(), nested));
+                    fillDictionary(f.sub->descriptor(), nested,
+                                   dict.emplace(DictKey::lasting(f.key), Dict()).asDict());
                 }
                 break;
             case FieldKind::MessageList: {
                 const void* list = slot(message, f);
                 const std::size_t n = f.sub->count(list);
                 if (n == 0) break;
-                Array values;
+                Array& values = dict.emplace(DictKey::lasting(f.key), Array()).asArray();
                 values.reserve(n);
                 const MessageDescriptor& nd = f.sub->descriptor();
                 for (std::size_t i = 0; i < n; ++i)
-                    values.emplace_back(dictionaryOf(nd, f.sub->at(list, i)));
-                dict.emplace(DictKey::lasting(f.key), std::move(values));
+                    fillDictionary(nd, f.sub->at(list, i), values.emplace_back(Dict()).asDict());
                 break;
             }
             case FieldKind::UInt32List:
@@ -471,6 +473,13 @@ Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
                 break;
         }
     }
+}
+
+}  // namespace
+
+Dict dictionaryOf(const MessageDescriptor& d, const void* message) {
+    Dict dict;
+    fillDictionary(d, message, dict);
     return dict;
 }
 
