@@ -145,6 +145,31 @@ TEST(MessageReader, EndGroupInsideNestedRecordEndsOnlyThatRecord) {
     EXPECT_EQ(m->timestamp(), 4U);
 }
 
+TEST(MessageReader, AListInterruptedByAnotherFieldKeepsEveryElementInOrder) {
+    // rxInfo rssi 1, rxInfo rssi 2, timestamp 4, rxInfo rssi 3.
+    const Bytes in =
+        bytes({0x1A, 0x02, 0x08, 0x02, 0x1A, 0x02, 0x08, 0x04, 0x08, 0x04, 0x1A, 0x02, 0x08, 0x06});
+    const auto m = KCellularLteServingCellMeasurement::initWithData(in);
+    ASSERT_TRUE(m.has_value());
+    ASSERT_EQ(m->rxInfosCount(), 3U);
+    for (std::size_t i = 0; i < 3; ++i)
+        EXPECT_EQ(m->rxInfoAtIndex(i)->rssi(), static_cast<std::int32_t>(i + 1));
+    EXPECT_EQ(m->timestamp(), 4U);
+}
+
+TEST(MessageReader, ALongRunOfElementsIsReadWhole) {
+    Bytes in;
+    for (int i = 0; i < 2000; ++i) {
+        const Bytes element = bytes({0x1A, 0x02, 0x08, static_cast<std::uint8_t>(2 * (i % 60))});
+        in.insert(in.end(), element.begin(), element.end());
+    }
+    const auto m = KCellularLteServingCellMeasurement::initWithData(in);
+    ASSERT_TRUE(m.has_value());
+    ASSERT_EQ(m->rxInfosCount(), 2000U);
+    for (std::size_t i = 0; i < 2000; ++i)
+        ASSERT_EQ(m->rxInfoAtIndex(i)->rssi(), static_cast<std::int32_t>(i % 60)) << i;
+}
+
 TEST(MessageReader, UnknownTagWithUnknownWireTypeFails) {
     EXPECT_FALSE(KCellularLteRrcState::initWithData(key(9, 7)).has_value());
     EXPECT_FALSE(KCellularLteRrcState::initWithData(key(9, 6)).has_value());
