@@ -4,13 +4,25 @@ namespace pyx::pool {
 
 thread_local FreeLists tLists{};
 
+#ifdef PYX_POOL_BYPASSED
+
+void* allocateSlow(std::size_t bytes) {
+    return ::operator new(bytes);
+}
+
+void releaseSlow(void* block, std::size_t /*bytes*/) noexcept {
+    ::operator delete(block);
+}
+
+#else
+
 namespace {
 
 void drain(FreeLists& lists) noexcept {
     for (std::size_t c = 0; c < kClasses; ++c) {
         while (FreeBlock* block = lists.head[c]) {
             lists.head[c] = block->next;
-            ::operator delete(block, blockSizeOf(c));
+            ::operator delete(block);
         }
         lists.count[c] = 0;
     }
@@ -34,18 +46,6 @@ void registerCleanUp() {
 
 }  // namespace
 
-#ifdef PYX_POOL_BYPASSED
-
-void* allocateSlow(std::size_t bytes) {
-    return ::operator new(bytes);
-}
-
-void releaseSlow(void* block, std::size_t bytes) noexcept {
-    ::operator delete(block, bytes);
-}
-
-#else
-
 // A pooled size is taken from the heap at its class's full size, so that any block of the
 // class can serve any request of it later.
 void* allocateSlow(std::size_t bytes) {
@@ -57,14 +57,10 @@ void* allocateSlow(std::size_t bytes) {
 
 void releaseSlow(void* block, std::size_t bytes) noexcept {
     const std::size_t c = classOf(bytes);
-    if (c >= kClasses) {
-        ::operator delete(block, bytes);
-        return;
-    }
     FreeLists& lists = tLists;
-    if (!lists.started) registerCleanUp();
-    if (lists.finished || lists.count[c] >= kKeptBytesPerClass / blockSizeOf(c)) {
-        ::operator delete(block, blockSizeOf(c));
+    if (c < kClasses && !lists.started) registerCleanUp();
+    if (c >= kClasses || lists.finished || lists.count[c] >= kKeptBytesPerClass / blockSizeOf(c)) {
+        ::operator delete(block);
         return;
     }
     auto* const freed = static_cast<FreeBlock*>(block);

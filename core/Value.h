@@ -41,7 +41,7 @@ class DictKey {
     static DictKey lasting(std::string_view key) {
         DictKey k;
         k.data_ = key.data();
-        k.size_ = key.size();
+        k.size_ = static_cast<std::uint32_t>(key.size());
         return k;
     }
 
@@ -122,7 +122,7 @@ class DictKey {
     std::uint32_t size_ = 0;
     Storage storage_ = Storage::Lasting;
     union {
-        char inline_[kInline];
+        char inline_[kInline] = {};
         char* heap_;
     };
 };
