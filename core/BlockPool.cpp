@@ -26,6 +26,7 @@ void drain(FreeLists& lists) noexcept {
         }
         lists.count[c] = 0;
     }
+    lists.keptBytes = 0;
 }
 
 // Gives the thread's kept blocks back to the heap when the thread ends.
@@ -59,7 +60,8 @@ void releaseSlow(void* block, std::size_t bytes) noexcept {
     const std::size_t c = classOf(bytes);
     FreeLists& lists = tLists;
     if (c < kClasses && !lists.started) registerCleanUp();
-    if (c >= kClasses || lists.finished || lists.count[c] >= kKeptBytesPerClass / blockSizeOf(c)) {
+    if (c >= kClasses || lists.finished || lists.count[c] >= kKeptBytesPerClass / blockSizeOf(c) ||
+        lists.keptBytes >= kKeptBytesPerThread) {
         ::operator delete(block);
         return;
     }
@@ -67,6 +69,7 @@ void releaseSlow(void* block, std::size_t bytes) noexcept {
     freed->next = lists.head[c];
     lists.head[c] = freed;
     ++lists.count[c];
+    lists.keptBytes += blockSizeOf(c);
 }
 
 #endif

@@ -3,8 +3,9 @@
 // with malloc each took a trip through glibc's bins (its per-thread cache keeps only seven blocks
 // of a size, and a list of forty neighbours overflows it). Here each thread keeps free lists of
 // its own, one per size class of 16 bytes up to 4 KiB, and a block goes back to the list of the
-// thread that lets it go. Every list is capped, so memory stays flat whichever thread makes and
-// whichever drops; the rest goes back to the heap.
+// thread that lets it go. Every list is capped, and all of a thread's lists together keep at
+// most 1 MiB, so memory stays flat whichever thread makes and whichever drops; the rest goes
+// back to the heap.
 //
 // Under AddressSanitizer the lists are bypassed, so that it still sees every use after free.
 #pragma once
@@ -28,8 +29,10 @@ namespace pool {
 inline constexpr std::size_t kGranule = 16;
 inline constexpr std::size_t kLargestPooled = 4096;
 inline constexpr std::size_t kClasses = kLargestPooled / kGranule;
-// What one list may keep, in bytes: a few lists of forty neighbours of every size.
+// What one list may keep, in bytes (a few lists of forty neighbours of every size), and what
+// all the lists of a thread may keep together: at most 1 MiB a thread stays out of the heap.
 inline constexpr std::size_t kKeptBytesPerClass = 64 * 1024;
+inline constexpr std::size_t kKeptBytesPerThread = 1024 * 1024;
 
 struct FreeBlock {
     FreeBlock* next;
@@ -40,8 +43,9 @@ struct FreeBlock {
 struct FreeLists {
     FreeBlock* head[kClasses];
     std::uint32_t count[kClasses];
-    bool started;   // the clean-up is registered
-    bool finished;  // the clean-up has run: lists are no longer kept
+    std::size_t keptBytes;  // in all the lists
+    bool started;           // the clean-up is registered
+    bool finished;          // the clean-up has run: lists are no longer kept
 };
 extern thread_local FreeLists tLists;
 
@@ -70,6 +74,7 @@ void releaseSlow(void* block, std::size_t bytes) noexcept;
         if (pool::FreeBlock* block = lists.head[c]) {
             lists.head[c] = block->next;
             --lists.count[c];
+            lists.keptBytes -= pool::blockSizeOf(c);
             return block;
         }
     }
@@ -84,11 +89,13 @@ inline void poolRelease(void* block, std::size_t bytes) noexcept {
     if (c < pool::kClasses) {
         pool::FreeLists& lists = pool::tLists;
         if (lists.started && !lists.finished &&
-            lists.count[c] < pool::kKeptBytesPerClass / pool::blockSizeOf(c)) {
+            lists.count[c] < pool::kKeptBytesPerClass / pool::blockSizeOf(c) &&
+            lists.keptBytes < pool::kKeptBytesPerThread) {
             auto* const freed = static_cast<pool::FreeBlock*>(block);
             freed->next = lists.head[c];
             lists.head[c] = freed;
             ++lists.count[c];
+            lists.keptBytes += pool::blockSizeOf(c);
             return;
         }
     }

@@ -26,6 +26,25 @@ TEST(BlockPool, ABlockLetGoIsTheNextOneMadeOfItsSize) {
 #endif
 }
 
+TEST(BlockPool, AThreadKeepsNoMoreThanItsCaps) {
+    std::thread([] {
+        std::vector<void*> blocks;
+        for (const std::size_t size : {64U, 1024U, 4096U}) {
+            for (int i = 0; i < 2000; ++i) blocks.push_back(pyx::poolAllocate(size));
+            for (void* block : blocks) pyx::poolRelease(block, size);
+            blocks.clear();
+#ifndef PYX_POOL_BYPASSED
+            const std::size_t c = pyx::pool::classOf(size);
+            EXPECT_LE(pyx::pool::tLists.count[c] * size, pyx::pool::kKeptBytesPerClass) << size;
+            EXPECT_GT(pyx::pool::tLists.count[c], 0U) << size;
+#endif
+        }
+#ifndef PYX_POOL_BYPASSED
+        EXPECT_LE(pyx::pool::tLists.keptBytes, pyx::pool::kKeptBytesPerThread);
+#endif
+    }).join();
+}
+
 TEST(BlockPool, BlocksAreAlignedAndLargeOnesComeFromTheHeap) {
     for (const std::size_t size : {1U, 16U, 17U, 1000U, 1024U, 1025U, 100000U}) {
         void* block = pyx::poolAllocate(size);
