@@ -297,9 +297,11 @@ void takePresentValue(const FieldDescriptor& f, const void* from, void* into, st
             const SubMessageOps& ops = *d.fields[s.index].sub;
             void* nested = nullptr;
             if (s.kind == kMessageList) {
-                has |= std::uint64_t{1} << s.bit;
                 void* const list = base + s.offset;
-                if (ops.count(list) == 0) {
+                // A list's bit is set with its first element: until then the list is empty,
+                // and it is given room for the records that follow under its key at once.
+                if ((has & (std::uint64_t{1} << s.bit)) == 0) {
+                    has |= std::uint64_t{1} << s.bit;
                     ops.reserve(list, recordsInARow(bytes, keyPosition, pos - keyPosition, limit));
                 }
                 nested = ops.appendNew(list);
