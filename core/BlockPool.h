@@ -123,10 +123,6 @@ struct PoolAllocator {
     friend bool operator==(const PoolAllocator& /*a*/, const PoolAllocator<U>& /*b*/) {
         return true;
     }
-    template <class U>
-    friend bool operator!=(const PoolAllocator& /*a*/, const PoolAllocator<U>& /*b*/) {
-        return false;
-    }
 };
 
 }  // namespace pyx

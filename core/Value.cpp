@@ -6,7 +6,9 @@
 #include <cstring>
 #include <limits>
 #include <memory>
+#include <new>
 #include <ostream>
+#include <stdexcept>
 #include <string_view>
 
 namespace pyx {
@@ -34,20 +36,78 @@ std::ostream& operator<<(std::ostream& out, const DictKey& key) {
 }
 
 Dict::Dict(std::initializer_list<DictEntry> entries) {
-    entries_.reserve(entries.size());
+    reserve(entries.size());
     for (const auto& e : entries) set(e.key, e.value);
 }
 
+void Dict::tooLarge() {
+    throw std::length_error("Dict: more entries than a dictionary can hold");
+}
+
+void Dict::makeOwn(std::size_t extra) {
+    if (rep_ == nullptr) {
+        if (extra != 0) reallocate(extra < kFirstRoom ? kFirstRoom : extra);
+        return;
+    }
+    const std::size_t needed = rep_->size + extra;
+    if (!owned()) {
+        reallocate(needed);
+    } else if (needed > rep_->room) {
+        const std::size_t doubled = 2 * std::size_t{rep_->room};
+        reallocate(needed > doubled ? needed : doubled < kFirstRoom ? kFirstRoom : doubled);
+    }
+}
+
+void Dict::reallocate(std::size_t room) {
+    Rep* const fresh = allocate(room);
+    const std::uint32_t n = rep_ == nullptr ? 0 : rep_->size;
+    if (n != 0) {
+        DictEntry* const to = entriesOf(fresh);
+        DictEntry* const from = entriesOf(rep_);
+        if (owned()) {
+            // Nobody else sees these entries: they move (a move cannot throw).
+            for (std::uint32_t i = 0; i < n; ++i) ::new (to + i) DictEntry(std::move(from[i]));
+        } else {
+            std::uint32_t made = 0;
+            try {
+                for (; made < n; ++made) ::new (to + made) DictEntry(from[made]);
+            } catch (...) {
+                fresh->size = made;
+                destroy(fresh);
+                throw;
+            }
+        }
+        fresh->size = n;
+    }
+    drop();
+    rep_ = fresh;
+}
+
+const DictEntry& Dict::at(std::size_t index) const {
+    if (index >= size()) throw std::out_of_range("Dict::at: no entry at that index");
+    return entriesOf(rep_)[index];
+}
+
+std::ptrdiff_t Dict::indexOf(std::string_view key) const {
+    const DictEntry* const first = begin();
+    const std::size_t n = size();
+    for (std::size_t i = 0; i < n; ++i) {
+        if (first[i].key == key) return static_cast<std::ptrdiff_t>(i);
+    }
+    return -1;
+}
+
 const Value* Dict::find(std::string_view key) const {
-    for (const auto& e : entries_)
-        if (e.key == key) return &e.value;
-    return nullptr;
+    const std::ptrdiff_t i = indexOf(key);
+    return i < 0 ? nullptr : &entriesOf(rep_)[i].value;
 }
 
 Value* Dict::find(std::string_view key) {
-    for (auto& e : entries_)
-        if (e.key == key) return &e.value;
-    return nullptr;
+    // Looked up first: a dictionary shared with others is copied only when the key is there.
+    const std::ptrdiff_t i = indexOf(key);
+    if (i < 0) return nullptr;
+    own();
+    return &entriesOf(rep_)[i].value;
 }
 
 Value& Dict::set(DictKey key, Value value) {
@@ -59,22 +119,30 @@ Value& Dict::set(DictKey key, Value value) {
 }
 
 Value& Dict::append(DictKey key, Value value) {
-    entries_.push_back(DictEntry{std::move(key), std::move(value)});
-    return entries_.back().value;
+    return emplace(std::move(key), std::move(value));
 }
 
 bool Dict::erase(std::string_view key) {
-    for (auto it = entries_.begin(); it != entries_.end(); ++it) {
-        if (it->key == key) {
-            entries_.erase(it);
-            return true;
-        }
-    }
-    return false;
+    const std::ptrdiff_t i = indexOf(key);
+    if (i < 0) return false;
+    own();
+    DictEntry* const entries = entriesOf(rep_);
+    const std::uint32_t n = rep_->size;
+    for (auto k = static_cast<std::uint32_t>(i); k + 1 < n; ++k)
+        entries[k] = std::move(entries[k + 1]);
+    entries[n - 1].~DictEntry();
+    --rep_->size;
+    return true;
 }
 
 bool operator==(const Dict& a, const Dict& b) {
-    return a.entries_ == b.entries_;
+    if (a.rep_ == b.rep_) return true;
+    const std::size_t n = a.size();
+    if (n != b.size()) return false;
+    for (std::size_t i = 0; i < n; ++i) {
+        if (!(a.begin()[i] == b.begin()[i])) return false;
+    }
+    return true;
 }
 
 std::optional<std::int64_t> Value::toInt64() const {

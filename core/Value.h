@@ -6,6 +6,8 @@
 // message's field order is its enumeration order everywhere).
 #pragma once
 
+#include <atomic>
+#include <cstddef>
 #include <cstdint>
 #include <cstring>
 #include <initializer_list>
@@ -70,21 +72,16 @@ class DictKey {
     [[nodiscard]] std::string_view view() const { return {data_, size_}; }
     operator std::string_view() const { return view(); }
     operator std::string() const { return std::string(view()); }
-    [[nodiscard]] std::string str() const { return std::string(view()); }
     [[nodiscard]] const char* data() const { return data_; }
     [[nodiscard]] std::size_t size() const { return size_; }
     [[nodiscard]] bool empty() const { return size_ == 0; }
+    // Whether dropping the key has anything to free (a long key of its own).
+    [[nodiscard]] bool ownsHeap() const { return storage_ == Storage::Heap; }
 
     friend bool operator==(const DictKey& a, const DictKey& b) { return a.view() == b.view(); }
     friend bool operator==(const DictKey& a, std::string_view b) { return a.view() == b; }
     friend bool operator==(const DictKey& a, const std::string& b) { return a.view() == b; }
     friend bool operator==(const DictKey& a, const char* b) { return a.view() == b; }
-    friend std::string operator+(const std::string& a, const DictKey& b) {
-        return a + std::string(b.view());
-    }
-    friend std::string operator+(const DictKey& a, const std::string& b) {
-        return std::string(a.view()) + b;
-    }
     friend std::ostream& operator<<(std::ostream& out, const DictKey& key);
 
   private:
@@ -129,28 +126,48 @@ class DictKey {
 
 // A dictionary with string keys, in insertion order. Lookups are linear: the system's
 // dictionaries hold a few dozen entries at most, where a scan beats hashing.
+//
+// Copies share their entries until one of them is changed (copy on write): the store keeps a
+// decoded record and hands its lists to the list holders, the screens take copies of both, and
+// none of that copies an entry. The entries sit in one pooled block after a small header (a
+// count of the dictionaries sharing them, the size, the room); an empty dictionary has none.
+// Whatever gives mutable access (a non-const begin, end or find, set, append, emplace, erase,
+// reserve) first makes the entries this dictionary's own, so a reference or pointer into a
+// dictionary is good until the next such call or until it is dropped, and a dictionary shared
+// with another thread is only read there (as every value handed between threads is).
 class Dict {
   public:
-    using Entries = std::vector<DictEntry, PoolAllocator<DictEntry>>;
-    using const_iterator = Entries::const_iterator;
-    using iterator = Entries::iterator;
+    using iterator = DictEntry*;
+    using const_iterator = const DictEntry*;
 
-    // The special members, like the accessors below, are defined after DictEntry, where the
-    // entry type is complete (clang instantiates the vector's members where they are used).
-    Dict();
-    ~Dict();
-    Dict(const Dict& other);
-    Dict(Dict&& other) noexcept;
-    Dict& operator=(const Dict& other);
-    Dict& operator=(Dict&& other) noexcept;
+    Dict() = default;
+    ~Dict() { drop(); }
+    Dict(const Dict& other) noexcept : rep_(other.rep_) {
+        if (rep_ != nullptr) rep_->shares.fetch_add(1, std::memory_order_relaxed);
+    }
+    Dict(Dict&& other) noexcept : rep_(other.rep_) { other.rep_ = nullptr; }
+    Dict& operator=(const Dict& other) noexcept {
+        Dict copy(other);
+        std::swap(rep_, copy.rep_);
+        return *this;
+    }
+    Dict& operator=(Dict&& other) noexcept {
+        if (this != &other) {
+            drop();
+            rep_ = other.rep_;
+            other.rep_ = nullptr;
+        }
+        return *this;
+    }
     Dict(std::initializer_list<DictEntry> entries);
 
-    [[nodiscard]] std::size_t size() const;
-    [[nodiscard]] bool empty() const;
+    [[nodiscard]] std::size_t size() const { return rep_ == nullptr ? 0 : rep_->size; }
+    [[nodiscard]] bool empty() const { return size() == 0; }
     [[nodiscard]] const_iterator begin() const;
     [[nodiscard]] const_iterator end() const;
     [[nodiscard]] iterator begin();
     [[nodiscard]] iterator end();
+    // Throws std::out_of_range past the end.
     [[nodiscard]] const DictEntry& at(std::size_t index) const;
 
     // The value under key, or nullptr when the key is absent.
@@ -174,7 +191,45 @@ class Dict {
     friend bool operator==(const Dict& a, const Dict& b);
 
   private:
-    Entries entries_;
+    struct Rep {
+        std::atomic<std::uint32_t> shares;  // dictionaries holding these entries
+        std::uint32_t size;
+        std::uint32_t room;
+        std::uint32_t unused;
+    };
+    static constexpr std::uint32_t kFirstRoom = 4;
+
+    [[nodiscard]] static DictEntry* entriesOf(Rep* rep);
+    [[nodiscard]] static const DictEntry* entriesOf(const Rep* rep);
+    [[nodiscard]] static Rep* allocate(std::size_t room);
+    [[noreturn]] static void tooLarge();
+    static void destroy(Rep* rep) noexcept;
+    [[nodiscard]] std::ptrdiff_t indexOf(std::string_view key) const;
+    [[nodiscard]] bool owned() const {
+        return rep_ != nullptr && rep_->shares.load(std::memory_order_acquire) == 1;
+    }
+    // Drops this dictionary's hold on its entries; the last one to hold them frees them.
+    void drop() noexcept {
+        if (rep_ == nullptr) return;
+        if (rep_->shares.load(std::memory_order_acquire) == 1 ||
+            rep_->shares.fetch_sub(1, std::memory_order_acq_rel) == 1) {
+            destroy(rep_);
+        }
+        rep_ = nullptr;
+    }
+    // Makes the entries this dictionary's own (a copy of shared ones), with room for `extra`
+    // more; an empty dictionary stays without a block.
+    void own(std::size_t extra = 0) {
+        if (rep_ == nullptr ? extra != 0 : (!owned() || rep_->size + extra > rep_->room))
+            makeOwn(extra);
+    }
+    // What own() does when the entries are shared, missing or full; out of line, so that every
+    // builder's append stays a check and a store.
+    void makeOwn(std::size_t extra);
+    // Entries of its own with room for at least `room`: the old ones copied (shared) or moved.
+    void reallocate(std::size_t room);
+
+    Rep* rep_ = nullptr;
 };
 
 class Value {
@@ -250,39 +305,58 @@ struct DictEntry {
     friend bool operator==(const DictEntry& a, const DictEntry& b) = default;
 };
 
-inline Dict::Dict() = default;
-inline Dict::~Dict() = default;
-inline Dict::Dict(const Dict& other) = default;
-inline Dict::Dict(Dict&& other) noexcept = default;
-inline Dict& Dict::operator=(const Dict& other) = default;
-inline Dict& Dict::operator=(Dict&& other) noexcept = default;
-inline std::size_t Dict::size() const {
-    return entries_.size();
+inline DictEntry* Dict::entriesOf(Rep* rep) {
+    return reinterpret_cast<DictEntry*>(rep + 1);
 }
-inline bool Dict::empty() const {
-    return entries_.empty();
+inline const DictEntry* Dict::entriesOf(const Rep* rep) {
+    return reinterpret_cast<const DictEntry*>(rep + 1);
 }
 inline Dict::const_iterator Dict::begin() const {
-    return entries_.begin();
+    return rep_ == nullptr ? nullptr : entriesOf(rep_);
 }
 inline Dict::const_iterator Dict::end() const {
-    return entries_.end();
+    return rep_ == nullptr ? nullptr : entriesOf(rep_) + rep_->size;
 }
 inline Dict::iterator Dict::begin() {
-    return entries_.begin();
+    own();
+    return rep_ == nullptr ? nullptr : entriesOf(rep_);
 }
 inline Dict::iterator Dict::end() {
-    return entries_.end();
+    own();
+    return rep_ == nullptr ? nullptr : entriesOf(rep_) + rep_->size;
 }
-inline const DictEntry& Dict::at(std::size_t index) const {
-    return entries_.at(index);
+inline Dict::Rep* Dict::allocate(std::size_t room) {
+    static_assert(alignof(DictEntry) <= 16 && sizeof(Rep) % alignof(DictEntry) == 0,
+                  "the entries follow the header, aligned as pooled blocks are");
+    if (room > 0xFFFFFFFFU) tooLarge();
+    void* const block = poolAllocate(sizeof(Rep) + room * sizeof(DictEntry));
+    return ::new (block) Rep{{1}, 0, static_cast<std::uint32_t>(room), 0};
 }
 inline void Dict::reserve(std::size_t n) {
-    entries_.reserve(n);
+    if (rep_ == nullptr) {
+        if (n != 0) rep_ = allocate(n);
+    } else if (n > rep_->room || !owned()) {
+        reallocate(n > rep_->size ? n : rep_->size);
+    }
 }
 template <class V>
 inline Value& Dict::emplace(DictKey key, V&& value) {
-    return entries_.emplace_back(std::move(key), std::forward<V>(value)).value;
+    own(1);
+    DictEntry* const entry =
+        ::new (entriesOf(rep_) + rep_->size) DictEntry(std::move(key), std::forward<V>(value));
+    ++rep_->size;
+    return entry->value;
+}
+inline void Dict::destroy(Rep* rep) noexcept {
+    DictEntry* const entries = entriesOf(rep);
+    for (std::uint32_t i = 0; i < rep->size; ++i) {
+        // Most entries hold a number under a table's key: nothing to free, nothing to run.
+        DictEntry& e = entries[i];
+        if (e.key.ownsHeap() || e.value.kind() >= Value::Kind::String) e.~DictEntry();
+    }
+    const std::size_t bytes = sizeof(Rep) + std::size_t{rep->room} * sizeof(DictEntry);
+    rep->~Rep();
+    poolRelease(rep, bytes);
 }
 
 // The shortest text that reads back as the same float, always with a decimal point

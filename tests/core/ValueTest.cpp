@@ -4,8 +4,12 @@
 
 #include <limits>
 #include <sstream>
+#include <stdexcept>
 #include <string>
 #include <string_view>
+#include <thread>
+#include <utility>
+#include <vector>
 
 using pyx::Array;
 using pyx::Bytes;
@@ -85,6 +89,137 @@ TEST(ValueDict, EmplaceAppendsAnEntryBuiltInPlace) {
     EXPECT_EQ(
         d,
         (Dict{{"a", Value(1)}, {longKey, Value(Array{Value(2), Value(3)})}, {"b", Value("text")}}));
+}
+
+// Where a dictionary's entries are, without asking for mutable access (which would make them
+// its own).
+const pyx::DictEntry* entriesOf(const Dict& d) {
+    return d.begin();
+}
+
+TEST(ValueDict, CopiesShareEntriesUntilOneIsChanged) {
+    Dict original{{"rsrp", Value(-95)}, {"name", Value("cell")}};
+    Dict copy = original;
+    EXPECT_EQ(entriesOf(copy), entriesOf(original));
+
+    copy.set("rsrp", Value(-80));
+    EXPECT_NE(entriesOf(copy), entriesOf(original));
+    EXPECT_EQ(original, (Dict{{"rsrp", Value(-95)}, {"name", Value("cell")}}));
+    EXPECT_EQ(copy, (Dict{{"rsrp", Value(-80)}, {"name", Value("cell")}}));
+
+    // Every way of changing a copy leaves the original as it was.
+    const Dict kept = original;
+    Dict appended = original;
+    appended.append("pci", Value(7));
+    Dict erased = original;
+    EXPECT_TRUE(erased.erase("rsrp"));
+    Dict found = original;
+    *found.find("name") = Value("other");
+    Dict iterated = original;
+    for (auto& e : iterated) e.value = Value(0);
+    Dict reserved = original;
+    reserved.reserve(10);
+    reserved.emplace("extra", Value(1));
+    EXPECT_EQ(original, kept);
+    EXPECT_EQ(original, (Dict{{"rsrp", Value(-95)}, {"name", Value("cell")}}));
+    EXPECT_EQ(appended.size(), 3U);
+    EXPECT_EQ(erased, (Dict{{"name", Value("cell")}}));
+    EXPECT_EQ(*found.find("name"), Value("other"));
+    EXPECT_EQ(iterated, (Dict{{"rsrp", Value(0)}, {"name", Value(0)}}));
+    EXPECT_EQ(reserved.size(), 3U);
+}
+
+TEST(ValueDict, LookingUpAnAbsentKeyDoesNotCopy) {
+    const Dict original{{"a", Value(1)}};
+    Dict copy = original;
+    EXPECT_EQ(copy.find("b"), nullptr);
+    EXPECT_FALSE(copy.erase("b"));
+    EXPECT_EQ(entriesOf(copy), entriesOf(original));
+}
+
+TEST(ValueDict, ANestedDictionaryChangedInACopyLeavesTheOriginal) {
+    Dict inner{{"pci", Value(1)}};
+    const Value original(Dict{{"cell", Value(inner)}, {"list", Value(Array{Value(inner)})}});
+    Value copy = original;
+    copy.asDict().find("cell")->asDict().set("pci", Value(2));
+    copy.asDict().find("list")->asArray()[0].asDict().set("pci", Value(3));
+    EXPECT_EQ(original.asDict().find("cell")->asDict(), inner);
+    EXPECT_EQ(original.asDict().find("list")->asArray()[0].asDict(), inner);
+    EXPECT_EQ(copy.description(), "{cell: {pci: 2}, list: [{pci: 3}]}");
+}
+
+TEST(ValueDict, GrowsKeepingOrderAndEveryKindOfEntry) {
+    Dict d;
+    for (int i = 0; i < 1000; ++i) {
+        const std::string key =
+            (i % 2 == 0 ? "a_key_longer_than_sixteen_" : "k") + std::to_string(i);
+        if (i % 3 == 0) {
+            d.append(key, Value(std::string(40, 'x')));
+        } else {
+            d.append(key, Value(i));
+        }
+    }
+    const Dict before = d;
+    ASSERT_EQ(d.size(), 1000U);
+    EXPECT_TRUE(d.erase("k501"));
+    EXPECT_EQ(d.size(), 999U);
+    EXPECT_EQ(d.at(500).key, "a_key_longer_than_sixteen_500");
+    EXPECT_EQ(d.at(501).key, "a_key_longer_than_sixteen_502");
+    EXPECT_EQ(*d.find("k997"), Value(997));
+    EXPECT_EQ(*d.find("a_key_longer_than_sixteen_996"), Value(std::string(40, 'x')));
+    EXPECT_EQ(before.size(), 1000U);
+    EXPECT_EQ(*before.find("k501"), Value(std::string(40, 'x')));
+}
+
+TEST(ValueDict, AnEmptyDictionaryHasNoEntriesAndAtChecksItsIndex) {
+    Dict d;
+    EXPECT_EQ(d.begin(), d.end());
+    EXPECT_TRUE(d.empty());
+    d.reserve(0);
+    EXPECT_EQ(entriesOf(d), nullptr);
+    EXPECT_THROW((void)d.at(0), std::out_of_range);
+    d.append("a", Value(1));
+    EXPECT_THROW((void)d.at(1), std::out_of_range);
+    EXPECT_EQ(d, (Dict{{"a", Value(1)}}));
+    EXPECT_NE(d, Dict{});
+}
+
+TEST(ValueDict, AssignmentsOfItselfAndOfOthers) {
+    Dict d{{"a", Value("one")}};
+    const Dict& same = d;
+    d = same;
+    EXPECT_EQ(d, (Dict{{"a", Value("one")}}));
+    Dict other{{"b", Value(2)}};
+    d = other;
+    EXPECT_EQ(entriesOf(d), entriesOf(other));
+    Dict moved = std::move(other);
+    EXPECT_EQ(moved, (Dict{{"b", Value(2)}}));
+    d = std::move(moved);
+    EXPECT_EQ(d, (Dict{{"b", Value(2)}}));
+}
+
+// A dictionary handed to other threads: each copies it, changes its copy and drops it while
+// the others still read theirs, as records go from the intake to the screens.
+TEST(ValueDict, CopiesOnOtherThreadsStayApart) {
+    const Dict shared{{"rsrp", Value(-95)},
+                      {"cells", Value(Array{Value(Dict{{"pci", Value(1)}})})}};
+    std::vector<std::thread> threads;
+    std::vector<int> failures(4, 0);
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&shared, &failures, t] {
+            for (int i = 0; i < 2000; ++i) {
+                Dict mine = shared;
+                mine.set("rsrp", Value(t));
+                mine.find("cells")->asArray()[0].asDict().set("pci", Value(i));
+                const Dict again = shared;
+                if (*again.find("rsrp") != Value(-95) || *mine.find("rsrp") != Value(t))
+                    ++failures[t];
+            }
+        });
+    }
+    for (auto& th : threads) th.join();
+    EXPECT_EQ(failures, std::vector<int>(4, 0));
+    EXPECT_EQ(Value(shared).description(), "{rsrp: -95, cells: [{pci: 1}]}");
 }
 
 TEST(ValueDictKey, ALastingKeyIsTheTableTextItself) {
