@@ -40,12 +40,14 @@ class DictKey {
     DictKey(const std::string& key) : DictKey(std::string_view(key)) {}
     DictKey(const char* key) : DictKey(std::string_view(key)) {}
     // A key whose text outlives every dictionary: a literal, a table's text.
-    static DictKey lasting(std::string_view key) {
-        DictKey k;
-        k.data_ = key.data();
-        k.size_ = static_cast<std::uint32_t>(key.size());
-        return k;
-    }
+    static DictKey lasting(std::string_view key) { return DictKey(Lasting{key}); }
+    // The same, for a builder that makes the key where the entry is kept (Dict::emplace):
+    // nothing is made and then moved.
+    struct Lasting {
+        std::string_view text;
+    };
+    DictKey(Lasting key)
+        : data_(key.text.data()), size_(static_cast<std::uint32_t>(key.text.size())) {}
 
     DictKey(const DictKey& other) {
         if (other.storage_ == Storage::Lasting) {
@@ -180,10 +182,17 @@ class Dict {
     // Appends without looking for an existing key; for builders that know keys are unique.
     Value& append(DictKey key, Value value);
     // As append, building the entry in place: the value is made where it is kept, from what
-    // the Value would be made of (the decoders build every dictionary this way, with keys of
-    // the field tables, DictKey::lasting: an integer, a text, a list or a dictionary).
+    // the Value would be made of (an integer, a text, a list or a dictionary). The decoders
+    // build every dictionary this way, with a field table's key as DictKey::Lasting, made in
+    // the entry too.
     template <class V>
-    Value& emplace(DictKey key, V&& value);
+    Value& emplace(DictKey key, V&& value) {
+        return put(std::move(key), std::forward<V>(value));
+    }
+    template <class V>
+    Value& emplace(DictKey::Lasting key, V&& value) {
+        return put(key, std::forward<V>(value));
+    }
     // Removes the key if present; returns whether it was.
     bool erase(std::string_view key);
     void reserve(std::size_t n);
@@ -226,6 +235,11 @@ class Dict {
     // What own() does when the entries are shared, missing or full; out of line, so that every
     // builder's append stays a check and a store.
     void makeOwn(std::size_t extra);
+    // Appends an entry made of key and value. When the entries must first move (shared,
+    // missing or full), the key and the value are made first: either may be a reference into
+    // these very entries.
+    template <class K, class V>
+    Value& put(K&& key, V&& value);
     // Entries of its own with room for at least `room`: the old ones copied (shared) or moved.
     void reallocate(std::size_t room);
 
@@ -297,8 +311,8 @@ class Value {
 struct DictEntry {
     DictEntry() = default;
     // The value is made where the entry is kept (Dict::emplace), from whatever makes a Value.
-    template <class V>
-    DictEntry(DictKey k, V&& v) : key(std::move(k)), value(std::forward<V>(v)) {}
+    template <class K, class V>
+    DictEntry(K&& k, V&& v) : key(std::forward<K>(k)), value(std::forward<V>(v)) {}
 
     DictKey key;
     Value value;
@@ -339,11 +353,19 @@ inline void Dict::reserve(std::size_t n) {
         reallocate(n > rep_->size ? n : rep_->size);
     }
 }
-template <class V>
-inline Value& Dict::emplace(DictKey key, V&& value) {
-    own(1);
-    DictEntry* const entry =
-        ::new (entriesOf(rep_) + rep_->size) DictEntry(std::move(key), std::forward<V>(value));
+template <class K, class V>
+inline Value& Dict::put(K&& key, V&& value) {
+    if (rep_ == nullptr || rep_->size == rep_->room || !owned()) [[unlikely]] {
+        DictKey madeKey(std::forward<K>(key));
+        Value madeValue(std::forward<V>(value));
+        makeOwn(1);
+        DictEntry* const entry = ::new (entriesOf(rep_) + rep_->size)
+            DictEntry(std::move(madeKey), std::move(madeValue));
+        ++rep_->size;
+        return entry->value;
+    }
+    DictEntry* const entry = ::new (entriesOf(rep_) + rep_->size)
+        DictEntry(std::forward<K>(key), std::forward<V>(value));
     ++rep_->size;
     return entry->value;
 }

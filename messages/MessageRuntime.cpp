@@ -419,46 +419,46 @@ void fillDictionary(const MessageDescriptor& d, const void* message, Dict& dict)
         switch (f.kind) {
             case FieldKind::UInt64:
                 if (isSet(has, f))
-                    dict.emplace(DictKey::lasting(f.key), at<std::uint64_t>(message, f));
+                    dict.emplace(DictKey::Lasting{f.key}, at<std::uint64_t>(message, f));
                 break;
             case FieldKind::UInt32:
                 if (isSet(has, f))
-                    dict.emplace(DictKey::lasting(f.key), at<std::uint32_t>(message, f));
+                    dict.emplace(DictKey::Lasting{f.key}, at<std::uint32_t>(message, f));
                 break;
             case FieldKind::SInt32:
                 if (isSet(has, f))
-                    dict.emplace(DictKey::lasting(f.key), at<std::int32_t>(message, f));
+                    dict.emplace(DictKey::Lasting{f.key}, at<std::int32_t>(message, f));
                 break;
             case FieldKind::Bool:
-                if (isSet(has, f)) dict.emplace(DictKey::lasting(f.key), at<bool>(message, f));
+                if (isSet(has, f)) dict.emplace(DictKey::Lasting{f.key}, at<bool>(message, f));
                 break;
             case FieldKind::Enum:
                 if (isSet(has, f)) {
-                    dict.emplace(DictKey::lasting(f.key),
+                    dict.emplace(DictKey::Lasting{f.key},
                                  f.enumTable->nameOf(at<std::int32_t>(message, f)));
                 }
                 break;
             case FieldKind::Data:
                 if (const auto& v = at<std::optional<Bytes>>(message, f)) {
-                    dict.emplace(DictKey::lasting(f.key), *v);
+                    dict.emplace(DictKey::Lasting{f.key}, *v);
                 }
                 break;
             case FieldKind::String:
                 if (const auto& v = at<std::optional<std::string>>(message, f)) {
-                    dict.emplace(DictKey::lasting(f.key), *v);
+                    dict.emplace(DictKey::Lasting{f.key}, *v);
                 }
                 break;
             case FieldKind::Message:
                 if (const void* nested = f.sub->get(slot(message, f))) {
                     fillDictionary(f.sub->descriptor(), nested,
-                                   dict.emplace(DictKey::lasting(f.key), Dict()).asDict());
+                                   dict.emplace(DictKey::Lasting{f.key}, Dict()).asDict());
                 }
                 break;
             case FieldKind::MessageList: {
                 const void* list = slot(message, f);
                 const std::size_t n = f.sub->count(list);
                 if (n == 0) break;
-                Array& values = dict.emplace(DictKey::lasting(f.key), Array()).asArray();
+                Array& values = dict.emplace(DictKey::Lasting{f.key}, Array()).asArray();
                 values.reserve(n);
                 const MessageDescriptor& nd = f.sub->descriptor();
                 for (std::size_t i = 0; i < n; ++i)
@@ -466,11 +466,11 @@ void fillDictionary(const MessageDescriptor& d, const void* message, Dict& dict)
                 break;
             }
             case FieldKind::UInt32List:
-                dict.emplace(DictKey::lasting(f.key),
+                dict.emplace(DictKey::Lasting{f.key},
                              PBRepeatedUInt32NSArray(at<PBRepeatedUInt32>(message, f)));
                 break;
             case FieldKind::SInt32List:
-                dict.emplace(DictKey::lasting(f.key),
+                dict.emplace(DictKey::Lasting{f.key},
                              PBRepeatedInt32NSArray(at<PBRepeatedInt32>(message, f)));
                 break;
         }

@@ -129,6 +129,24 @@ TEST(ValueDict, CopiesShareEntriesUntilOneIsChanged) {
     EXPECT_EQ(reserved.size(), 3U);
 }
 
+// An entry made from another entry of the same dictionary, when the entries must move first
+// (full, or shared with a copy): the key and value are taken before they move.
+TEST(ValueDict, AnEntryMadeFromItsOwnEntriesWhileTheyMove) {
+    Dict full;
+    full.reserve(1);
+    full.append("a_key_longer_than_sixteen", Value(std::string(40, 'v')));
+    full.emplace(full.at(0).key, full.at(0).value);
+    EXPECT_EQ(full.at(1).key, "a_key_longer_than_sixteen");
+    EXPECT_EQ(full.at(1).value, Value(std::string(40, 'v')));
+
+    Dict shared{{"a_key_longer_than_sixteen", Value(std::string(40, 'w'))}};
+    const Dict copy = shared;
+    shared.emplace(copy.at(0).key, shared.find("a_key_longer_than_sixteen")->asString());
+    EXPECT_EQ(shared.size(), 2U);
+    EXPECT_EQ(shared.at(1).value, Value(std::string(40, 'w')));
+    EXPECT_EQ(copy.size(), 1U);
+}
+
 TEST(ValueDict, LookingUpAnAbsentKeyDoesNotCopy) {
     const Dict original{{"a", Value(1)}};
     Dict copy = original;
