@@ -133,6 +133,7 @@ FocusScope {
                 property string shown: ""
                 property var names: []
                 readonly property alias timeAxis: timeAxis
+                readonly property alias valueAxis: valueAxis
                 objectName: "panel" + index
                 width: panels.width
                 height: panels.height / Math.max(1, page.chart.panelCount)
@@ -227,33 +228,37 @@ FocusScope {
                         panel.names = names
                         panel.shown = signature
                     }
+                    // Emptied before the axes move and filled after: each line is laid out once.
+                    for (let k = 0; k < view.count; ++k)
+                        page.chart.clearChanged(panel.index, k, view.series(k))
                     moveWindow(true)
                     setRange()
                     for (let k = 0; k < view.count; ++k)
                         page.chart.fill(panel.index, k, view.series(k))
                 }
 
-                // The same lines as drawn: only those whose points changed take them (the window
-                // follows on windowMoved).
+                // The same lines as drawn: only those whose points changed take them, emptied
+                // before the axes follow the window and the values (and filled after), so that
+                // each line is laid out once a refresh however many of these changed.
                 function extend() {
                     if (!page.chart || panel.index >= page.chart.panelCount)
                         return
+                    for (let k = 0; k < view.count; ++k)
+                        page.chart.clearChanged(panel.index, k, view.series(k))
                     setRange()
+                    moveWindow(false)
                     for (let k = 0; k < view.count; ++k)
                         page.chart.extend(panel.index, k, view.series(k))
                 }
 
-                // The value axis is set (and laid out again) only when its range moved.
+                // The value axis is set (and laid out again) only when its range moved, in one
+                // change.
                 property string range: ""
                 function setRange() {
-                    const low = page.chart.minimum(panel.index)
-                    const high = page.chart.maximum(panel.index)
-                    const key = low + ":" + high
+                    const key = page.chart.minimum(panel.index) + ":" + page.chart.maximum(panel.index)
                     if (key === panel.range)
                         return
-                    valueAxis.min = low
-                    valueAxis.max = high
-                    valueAxis.applyNiceNumbers()
+                    page.chart.showRange(panel.index, valueAxis)
                     panel.range = key
                 }
 

@@ -2,6 +2,7 @@
 
 #include <QDateTime>
 #include <QDateTimeAxis>
+#include <QValueAxis>
 #include <QXYSeries>
 
 #include <algorithm>
@@ -124,6 +125,32 @@ void ChartModel::extend(int panel, int index, QObject* series) const {
     const auto at = static_cast<std::size_t>(index);
     if (p->changes[at] != Change::Same || line->count() != p->segments[at].size())
         line->replace(p->segments[at]);
+}
+
+void ChartModel::clearChanged(int panel, int index, QObject* series) const {
+    auto* const line = qobject_cast<QXYSeries*>(series);
+    const Panel* p = panelAt(panel);
+    if (line == nullptr || p == nullptr || index < 0 ||
+        index >= static_cast<int>(p->segments.size()))
+        return;
+    const auto at = static_cast<std::size_t>(index);
+    if (line->count() > 0 &&
+        (p->changes[at] != Change::Same || line->count() != p->segments[at].size()))
+        line->replace(QList<QPointF>());
+}
+
+void ChartModel::showRange(int panel, QObject* axis) const {
+    auto* const value = qobject_cast<QValueAxis*>(axis);
+    const Panel* p = panelAt(panel);
+    if (value == nullptr || p == nullptr) return;
+    // Rounded on an axis of no chart: on the drawn one, the range and the rounding would each
+    // lay every line out again.
+    QValueAxis nice;
+    nice.setTickCount(value->tickCount());
+    nice.setRange(p->minimum, p->maximum);
+    nice.applyNiceNumbers();
+    value->setTickCount(nice.tickCount());
+    value->setRange(nice.min(), nice.max());
 }
 
 void ChartModel::showWindow(QObject* axis) const {

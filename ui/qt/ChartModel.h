@@ -8,9 +8,11 @@
 // A page is open all day, so a refresh that finds the same lines as before (the common case:
 // a point or two more, the oldest ones leaving the window) does not have the page rebuild
 // them: it notes which segments changed, the page hands only those their points (extend()),
-// and each change to the chart is one change (the window's two ends move together), since
-// Qt Charts lays out every line again on each. The work per refresh depends on the window,
-// never on how long the program has run.
+// and each change to the chart is one change (the window's two ends move together, the value
+// range and its rounding too), since Qt Charts lays out every line again on each. A line
+// whose points change is emptied before the axes move (clearChanged()), so that each line is
+// laid out once a refresh. The work per refresh depends on the window, never on how long the
+// program has run.
 #pragma once
 
 #include <QList>
@@ -84,9 +86,17 @@ class ChartModel : public QObject {
     // refresh before (one change, so the chart lays the line out once); a series whose points
     // are as they were is left alone.
     Q_INVOKABLE void extend(int panel, int segment, QObject* series) const;
+    // Empties a line series unless it holds the segment's points as they were (after changed(),
+    // every one): called before the axes move, so that moving them lays out only the lines that
+    // keep their points, and each of the others is laid out once, when extend() or fill() gives
+    // it its points.
+    Q_INVOKABLE void clearChanged(int panel, int segment, QObject* series) const;
     // Sets a date-time axis to the window in one change (its minimum and maximum set one after
     // the other would lay every line out twice).
     Q_INVOKABLE void showWindow(QObject* axis) const;
+    // Sets a value axis to the panel's value range rounded out to nice numbers (as
+    // applyNiceNumbers() rounds it, from the axis's tick count) in one change of range.
+    Q_INVOKABLE void showRange(int panel, QObject* axis) const;
 
     // Reads the history again if points were added to the chart since it was last read, or a
     // line would leave the window, and emits changed (and windowMoved), or extended (and

@@ -197,6 +197,29 @@ TestCase {
         drawnMatchesTheModel(page, 1)
     }
 
+    function test_theValueAxisCoversTheLinesInRoundNumbers() {
+        idle(-82, start)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chart = page.chart
+        const axis = findChild(page, "panel0").valueAxis
+        const covers = () => {
+            verify(axis.min <= chart.minimum(0) && axis.max >= chart.maximum(0),
+                   axis.min + ".." + axis.max + " for " + chart.minimum(0) + ".." + chart.maximum(0))
+            const step = (axis.max - axis.min) / (axis.tickCount - 1)
+            compare(Math.round(axis.min / step) * step, axis.min)
+            compare(Math.round(axis.max / step) * step, axis.max)
+        }
+        covers()
+        idle(-40, start + 2000)
+        chart.refresh()
+        covers()
+        verify(axis.max >= -40)
+        idle(-110, start + 4000)
+        chart.refresh()
+        covers()
+        verify(axis.min <= -110)
+    }
+
     function lteTxPower(dBm, atMs) {
         verify(testStore.record("myLTETxPowerDict",
                                 ["tx_power_info", [["pusch_tx_power", dBm]]], atMs))
