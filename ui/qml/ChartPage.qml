@@ -208,6 +208,10 @@ FocusScope {
                     }
                 }
 
+                // The lines, panels or texts changed: one line series per segment. The series
+                // drawn already are kept for the new segments (named and coloured again); only
+                // those missing are made and those left over removed, so that lines coming and
+                // going leave no series behind.
                 function redraw() {
                     if (!page.chart || panel.index >= page.chart.panelCount)
                         return
@@ -219,9 +223,12 @@ FocusScope {
                     const signature = names.join("\n") + "|" + owners.join(",") + "|" + page.dark
                     if (signature !== panel.shown) {
                         panel.range = ""
-                        view.removeAllSeries()
+                        while (view.count > segments)
+                            view.removeSeries(view.series(view.count - 1))
                         for (let k = 0; k < segments; ++k) {
-                            const line = view.createSeries(ChartView.SeriesTypeLine, names[owners[k]], timeAxis, valueAxis)
+                            const line = k < view.count ? view.series(k)
+                                : view.createSeries(ChartView.SeriesTypeLine, names[owners[k]], timeAxis, valueAxis)
+                            line.name = names[owners[k]]
                             line.color = page.lineColor(owners[k])
                             line.width = 2
                         }

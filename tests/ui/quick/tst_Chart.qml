@@ -197,6 +197,74 @@ TestCase {
         drawnMatchesTheModel(page, 1)
     }
 
+    // GSM neighbours heard at atMs: [arfcn, rxlev] pairs.
+    function gsmNeighbours(cells, atMs) {
+        let entries = []
+        for (const cell of cells)
+            entries.push(["arfcn", cell[0], "rxlev", cell[1]])
+        verify(testStore.record("myGSMNbrMeasDict", ["gsm_ncell_meas", entries], atMs))
+    }
+
+    // Every line the first panel draws: one line series per segment, named and coloured as its
+    // line in the legend, with the segment's points.
+    function drawnLinesMatchTheModel(page) {
+        const chart = page.chart
+        const panel = findChild(page, "panel0")
+        const view = findChild(panel, "chartView")
+        compare(view.count, chart.segmentCount(0))
+        const names = chart.seriesNames(0)
+        compare(panel.names, names)
+        for (let k = 0; k < view.count; ++k) {
+            const line = chart.segmentLine(0, k)
+            compare(view.series(k).name, names[line])
+            verify(Qt.colorEqual(view.series(k).color, page.lineColor(line)))
+            drawnMatchesTheModel(page, k)
+        }
+    }
+
+    function test_neighboursComingAndGoingLeaveNoLinesBehind() {
+        gsmNeighbours([[58, -70]], start - 2000)
+        const page = openChart("GSM", "GSM Neighbor Cell Meas")
+        const chart = page.chart
+        const view = findChild(findChild(page, "panel0"), "chartView")
+        changedSpy.target = chart
+        changedSpy.clear()
+        // Ten minutes of neighbours every two seconds: one always there, three of six others in
+        // turn, each gone long enough now and then for its line to break.
+        let most = 0
+        let kept = null
+        for (let i = 0; i < 300; ++i) {
+            let cells = [[58, -70 - (i % 5)]]
+            for (let n = 0; n < 6; ++n) {
+                if (Math.floor(i / (7 + n)) % 2 === n % 2)
+                    cells.push([60 + n, -80 - n - (i % 3)])
+            }
+            gsmNeighbours(cells, start + i * 2000)
+            chart.refresh()
+            drawnLinesMatchTheModel(page)
+            most = Math.max(most, chart.segmentCount(0))
+            if (i === 0)
+                kept = view.series(0)
+        }
+        // The first line series drew a segment all along, whichever: kept, not made anew.
+        verify(view.series(0) === kept)
+        verify(changedSpy.count > 20, changedSpy.count)
+        verify(most > 7, most)
+        // Nothing is left of the lines that went: as many series as segments, no more.
+        compare(view.count, chart.segmentCount(0))
+        // Only the always-heard neighbour after the others stop.
+        for (let i = 300; i < 460; ++i) {
+            gsmNeighbours([[58, -72]], start + i * 2000)
+            chart.refresh()
+        }
+        compare(chart.seriesNames(0), ["ARFCN 58"])
+        compare(chart.segmentCount(0), 1)
+        compare(view.count, 1)
+        drawnLinesMatchTheModel(page)
+        const legend = findChild(findChild(page, "panel0"), "legend")
+        compare(legend.children.length, 3)  // the caption, one name and the repeater
+    }
+
     function test_theValueAxisCoversTheLinesInRoundNumbers() {
         idle(-82, start)
         const page = openChart("GSM", "Idle Serv Cell Meas")
