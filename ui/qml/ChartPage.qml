@@ -145,9 +145,10 @@ FocusScope {
                     antialiasing: true
                     animationOptions: ChartView.NoAnimation
                     theme: page.dark ? ChartView.ChartThemeDark : ChartView.ChartThemeLight
+                    // The plot area shows this background: a plot area colour of its own, even
+                    // the same one, would be painted over it again on every change.
                     backgroundColor: page.colors.base
                     backgroundRoundness: 0
-                    plotAreaColor: page.colors.base
                     margins { top: 2; bottom: 0; left: 4; right: 8 }
                     legend.visible: false
                     localizeNumbers: false

@@ -265,6 +265,26 @@ TestCase {
         compare(legend.children.length, 3)  // the caption, one name and the repeater
     }
 
+    function test_thePlotAreaShowsThePageBackground() {
+        idle(-82, start)
+        idle(-80, start + 30000)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chartView = findChild(findChild(page, "panel0"), "chartView")
+        waitForRendering(view)
+        const image = grabImage(view)
+        const area = chartView.plotArea
+        verify(area.width > 100 && area.height > 100, area.width + "x" + area.height)
+        // Inside the corners of the plot area, clear of the grid and of the line.
+        const corners = [[area.x + 4, area.y + 4], [area.x + area.width - 5, area.y + 4],
+                         [area.x + 4, area.y + area.height - 5],
+                         [area.x + area.width - 5, area.y + area.height - 5]]
+        for (const corner of corners) {
+            const at = chartView.mapToItem(view, corner[0], corner[1])
+            const seen = image.pixel(Math.round(at.x), Math.round(at.y))
+            verify(Qt.colorEqual(seen, page.colors.base), seen + " at " + at)
+        }
+    }
+
     function test_theValueAxisCoversTheLinesInRoundNumbers() {
         idle(-82, start)
         const page = openChart("GSM", "Idle Serv Cell Meas")
