@@ -26,6 +26,15 @@ FocusScope {
     // Ticks fit the width: about one per 90 pixels, at least three.
     readonly property int timeTicks: Math.max(3, Math.min(7, Math.floor(width / 90)))
 
+    // The lines are never drawn wider than the page: the model hands the chart no more
+    // points than its pixels can show.
+    Binding {
+        target: page.chart
+        property: "columns"
+        value: Math.floor(page.width)
+        when: page.chart !== null && page.width > 0
+    }
+
     StackView.onRemoved: if (page.navigator && page.screen) page.navigator.release(page.screen)
     StackView.onActivated: page.forceActiveFocus()
 

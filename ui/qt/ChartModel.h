@@ -11,8 +11,8 @@
 // and each change to the chart is one change (the window's two ends move together, the value
 // range and its rounding too), since Qt Charts lays out every line again on each. A line
 // whose points change is emptied before the axes move (clearChanged()), so that each line is
-// laid out once a refresh. The work per refresh depends on the window, never on how long the
-// program has run.
+// laid out once a refresh. The work per refresh depends on the window and, for a long one,
+// on how wide the page is (columns), never on how long the program has run.
 #pragma once
 
 #include <QList>
@@ -45,6 +45,7 @@ class ChartModel : public QObject {
     Q_PROPERTY(int panelCount READ panelCount NOTIFY changed)
     Q_PROPERTY(double fromMs READ fromMs NOTIFY windowMoved)
     Q_PROPERTY(double toMs READ toMs NOTIFY windowMoved)
+    Q_PROPERTY(int columns READ columns WRITE setColumns NOTIFY columnsChanged)
 
   public:
     ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent = nullptr);
@@ -63,6 +64,12 @@ class ChartModel : public QObject {
     [[nodiscard]] QString missingText() const { return missingText_; }
     [[nodiscard]] int panelCount() const { return static_cast<int>(panels_.size()); }
     [[nodiscard]] double fromMs() const { return fromMs_; }
+    // How many pixels wide the lines are drawn (0, the first, for no limit). Where the window
+    // holds several slots per pixel, the slots of each run that still fits within a pixel are
+    // drawn as one, their lowest and highest value: the points handed to the chart depend on
+    // the width, not on the window (half an hour on a phone is two slots to a pixel).
+    [[nodiscard]] int columns() const { return columns_; }
+    void setColumns(int columns);
     [[nodiscard]] double toMs() const { return toMs_; }
 
     // The panel's unit ("dBm"), its lines' names, and the value range drawn.
@@ -113,6 +120,7 @@ class ChartModel : public QObject {
     // The window's times changed.
     void windowMoved();
     void windowMinutesChanged();
+    void columnsChanged();
 
   private:
     // Whether a segment's points differ from the refresh before.
@@ -136,6 +144,7 @@ class ChartModel : public QObject {
     std::shared_ptr<const History> history_;
     Chart chart_;
     int windowMinutes_ = 5;
+    int columns_ = 0;
     std::vector<Panel> panels_;
     QString missingText_;
     double fromMs_ = 0;

@@ -285,6 +285,41 @@ TestCase {
         }
     }
 
+    function test_aLongWindowDrawsNoMorePointsThanThePageHasPixels() {
+        // Half an hour of a low and a high value in every two-second slot.
+        for (let i = 0; i < 900; ++i) {
+            idle(-80 - (i % 4), start + i * 2000)
+            idle(-70 + (i % 3), start + i * 2000 + 1000)
+        }
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chart = page.chart
+        compare(chart.columns, Math.floor(page.width))
+        // Five minutes: every slot, its low and its high value.
+        compare(chart.segmentCount(0), 1)
+        compare(chart.points(0, 0).length, 2 * 150)
+        drawnMatchesTheModel(page, 0)
+        // Half an hour on 390 pixels: two slots to a column, as low and as high as both.
+        mouseClick(findChild(page, "window30"))
+        compare(chart.segmentCount(0), 1)
+        const points = chart.points(0, 0)
+        compare(points.length, 2 * 450)
+        let lowest = 0
+        let highest = -200
+        for (const point of points) {
+            lowest = Math.min(lowest, point.y)
+            highest = Math.max(highest, point.y)
+        }
+        compare(lowest, -83)
+        compare(highest, -68)
+        compare(chart.minimum(0) <= -83 && chart.maximum(0) >= -68, true)
+        drawnMatchesTheModel(page, 0)
+        // Each column spans its slots: from the first slot's time, low then high.
+        compare(points[0].x, start)
+        compare(points[1].x, start + 1)
+        compare(points[0].y, -81)
+        compare(points[1].y, -69)
+    }
+
     function test_theValueAxisCoversTheLinesInRoundNumbers() {
         idle(-82, start)
         const page = openChart("GSM", "Idle Serv Cell Meas")
