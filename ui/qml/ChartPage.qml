@@ -26,6 +26,15 @@ FocusScope {
     // Ticks fit the width: about one per 90 pixels, at least three.
     readonly property int timeTicks: Math.max(3, Math.min(7, Math.floor(width / 90)))
 
+    // The lines are never drawn wider than the page: the model hands the chart no more
+    // points than its pixels can show.
+    Binding {
+        target: page.chart
+        property: "columns"
+        value: Math.floor(page.width)
+        when: page.chart !== null && page.width > 0
+    }
+
     StackView.onRemoved: if (page.navigator && page.screen) page.navigator.release(page.screen)
     StackView.onActivated: page.forceActiveFocus()
 
@@ -133,6 +142,7 @@ FocusScope {
                 property string shown: ""
                 property var names: []
                 readonly property alias timeAxis: timeAxis
+                readonly property alias valueAxis: valueAxis
                 objectName: "panel" + index
                 width: panels.width
                 height: panels.height / Math.max(1, page.chart.panelCount)
@@ -144,9 +154,10 @@ FocusScope {
                     antialiasing: true
                     animationOptions: ChartView.NoAnimation
                     theme: page.dark ? ChartView.ChartThemeDark : ChartView.ChartThemeLight
+                    // The plot area shows this background: a plot area colour of its own, even
+                    // the same one, would be painted over it again on every change.
                     backgroundColor: page.colors.base
                     backgroundRoundness: 0
-                    plotAreaColor: page.colors.base
                     margins { top: 2; bottom: 0; left: 4; right: 8 }
                     legend.visible: false
                     localizeNumbers: false
@@ -207,6 +218,10 @@ FocusScope {
                     }
                 }
 
+                // The lines, panels or texts changed: one line series per segment. The series
+                // drawn already are kept for the new segments (named and coloured again); only
+                // those missing are made and those left over removed, so that lines coming and
+                // going leave no series behind.
                 function redraw() {
                     if (!page.chart || panel.index >= page.chart.panelCount)
                         return
@@ -218,42 +233,49 @@ FocusScope {
                     const signature = names.join("\n") + "|" + owners.join(",") + "|" + page.dark
                     if (signature !== panel.shown) {
                         panel.range = ""
-                        view.removeAllSeries()
+                        while (view.count > segments)
+                            view.removeSeries(view.series(view.count - 1))
                         for (let k = 0; k < segments; ++k) {
-                            const line = view.createSeries(ChartView.SeriesTypeLine, names[owners[k]], timeAxis, valueAxis)
+                            const line = k < view.count ? view.series(k)
+                                : view.createSeries(ChartView.SeriesTypeLine, names[owners[k]], timeAxis, valueAxis)
+                            line.name = names[owners[k]]
                             line.color = page.lineColor(owners[k])
                             line.width = 2
                         }
                         panel.names = names
                         panel.shown = signature
                     }
+                    // Emptied before the axes move and filled after: each line is laid out once.
+                    for (let k = 0; k < view.count; ++k)
+                        page.chart.clearChanged(panel.index, k, view.series(k))
                     moveWindow(true)
                     setRange()
                     for (let k = 0; k < view.count; ++k)
                         page.chart.fill(panel.index, k, view.series(k))
                 }
 
-                // The same lines as drawn: only those whose points changed take them (the window
-                // follows on windowMoved).
+                // The same lines as drawn: only those whose points changed take them, emptied
+                // before the axes follow the window and the values (and filled after), so that
+                // each line is laid out once a refresh however many of these changed.
                 function extend() {
                     if (!page.chart || panel.index >= page.chart.panelCount)
                         return
+                    for (let k = 0; k < view.count; ++k)
+                        page.chart.clearChanged(panel.index, k, view.series(k))
                     setRange()
+                    moveWindow(false)
                     for (let k = 0; k < view.count; ++k)
                         page.chart.extend(panel.index, k, view.series(k))
                 }
 
-                // The value axis is set (and laid out again) only when its range moved.
+                // The value axis is set (and laid out again) only when its range moved, in one
+                // change.
                 property string range: ""
                 function setRange() {
-                    const low = page.chart.minimum(panel.index)
-                    const high = page.chart.maximum(panel.index)
-                    const key = low + ":" + high
+                    const key = page.chart.minimum(panel.index) + ":" + page.chart.maximum(panel.index)
                     if (key === panel.range)
                         return
-                    valueAxis.min = low
-                    valueAxis.max = high
-                    valueAxis.applyNiceNumbers()
+                    page.chart.showRange(panel.index, valueAxis)
                     panel.range = key
                 }
 

@@ -2,6 +2,7 @@
 
 #include <QDateTime>
 #include <QDateTimeAxis>
+#include <QValueAxis>
 #include <QXYSeries>
 
 #include <algorithm>
@@ -32,6 +33,46 @@ std::size_t firstInWindow(const SeriesRing& ring, double fromMs) {
     return low;
 }
 
+// The slots of one column of pixels merged, drawn as their lowest and highest value (one
+// point when those are equal), the one that came last drawn last, at the first slot's time.
+struct Column {
+    bool open = false;
+    std::int64_t number = 0;
+    double timeMs = 0;
+    float min = 0;
+    float max = 0;
+    bool endsHigh = false;
+
+    void start(std::int64_t columnNumber, const Bucket& b) {
+        open = true;
+        number = columnNumber;
+        timeMs = b.timeMs;
+        min = b.min;
+        max = b.max;
+        endsHigh = b.last == b.max;
+    }
+    // A later slot: an end it reaches came after the ends of the slots before it.
+    void merge(const Bucket& b) {
+        const bool lower = b.min <= min;
+        const bool higher = b.max >= max;
+        if (lower && higher)
+            endsHigh = b.last == b.max;
+        else if (lower || higher)
+            endsHigh = higher;
+        min = std::min(min, b.min);
+        max = std::max(max, b.max);
+    }
+    void drawInto(QList<QPointF>& line) {
+        open = false;
+        if (min == max) {
+            line.append(QPointF(timeMs, min));
+            return;
+        }
+        line.append(QPointF(timeMs, endsHigh ? min : max));
+        line.append(QPointF(timeMs + 1, endsHigh ? max : min));
+    }
+};
+
 }  // namespace
 
 ChartModel::ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent)
@@ -47,6 +88,15 @@ void ChartModel::setWindowMinutes(int minutes) {
     if (minutes == windowMinutes_ || !windowChoices().contains(minutes)) return;
     windowMinutes_ = minutes;
     emit windowMinutesChanged();
+    rebuild();
+    emit changed();
+    emit windowMoved();
+}
+
+void ChartModel::setColumns(int columns) {
+    if (columns == columns_ || columns < 0) return;
+    columns_ = columns;
+    emit columnsChanged();
     rebuild();
     emit changed();
     emit windowMoved();
@@ -126,6 +176,32 @@ void ChartModel::extend(int panel, int index, QObject* series) const {
         line->replace(p->segments[at]);
 }
 
+void ChartModel::clearChanged(int panel, int index, QObject* series) const {
+    auto* const line = qobject_cast<QXYSeries*>(series);
+    const Panel* p = panelAt(panel);
+    if (line == nullptr || p == nullptr || index < 0 ||
+        index >= static_cast<int>(p->segments.size()))
+        return;
+    const auto at = static_cast<std::size_t>(index);
+    if (line->count() > 0 &&
+        (p->changes[at] != Change::Same || line->count() != p->segments[at].size()))
+        line->replace(QList<QPointF>());
+}
+
+void ChartModel::showRange(int panel, QObject* axis) const {
+    auto* const value = qobject_cast<QValueAxis*>(axis);
+    const Panel* p = panelAt(panel);
+    if (value == nullptr || p == nullptr) return;
+    // Rounded on an axis of no chart: on the drawn one, the range and the rounding would each
+    // lay every line out again.
+    QValueAxis nice;
+    nice.setTickCount(value->tickCount());
+    nice.setRange(p->minimum, p->maximum);
+    nice.applyNiceNumbers();
+    value->setTickCount(nice.tickCount());
+    value->setRange(nice.min(), nice.max());
+}
+
 void ChartModel::showWindow(QObject* axis) const {
     if (auto* const time = qobject_cast<QDateTimeAxis*>(axis))
         time->setRange(QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(fromMs_)),
@@ -177,6 +253,12 @@ void ChartModel::rebuild() {
     toMs_ = history_->newestMs().value_or(0);
     fromMs_ = toMs_ - windowMinutes_ * 60'000.0;
 
+    // Slots to a column: as many as fit within a pixel, at least one.
+    const History::Limits& limits = history_->limits();
+    const double slotMs = limits.windowMs / static_cast<double>(limits.pointsPerSeries);
+    const auto slotsPerColumn = static_cast<std::int64_t>(
+        std::max(1.0, columns_ > 0 ? std::floor((toMs_ - fromMs_) / (columns_ * slotMs)) : 1.0));
+
     const auto series = history_->seriesOf(chart_, fromMs_);
     leavesAfterMs_ = std::numeric_limits<double>::infinity();
     for (const Series* s : series)
@@ -227,9 +309,11 @@ void ChartModel::rebuild() {
                 shown > 1 ? (ring.newest().timeMs - firstMs) / static_cast<double>(shown - 1) : 0;
             const double gapMs = std::max(kGapMs, kGapSpacings * spacing);
             double previousMs = -std::numeric_limits<double>::infinity();
+            Column column;
             for (std::size_t i = first; i < ring.size(); ++i) {
                 const Bucket& b = ring.at(i);
-                if (b.timeMs - previousMs > gapMs && !line.isEmpty()) {
+                if (b.timeMs - previousMs > gapMs && column.open) {
+                    column.drawInto(line);
                     panel.segments.push_back(std::move(line));
                     panel.segmentLines.push_back(lineIndex);
                     line = QList<QPointF>();
@@ -237,16 +321,16 @@ void ChartModel::rebuild() {
                 previousMs = b.timeMs;
                 low = std::min(low, static_cast<double>(b.min));
                 high = std::max(high, static_cast<double>(b.max));
-                if (b.min == b.max) {
-                    line.append(QPointF(b.timeMs, b.min));
+                const std::int64_t number = b.slot / slotsPerColumn;
+                if (column.open && column.number == number) {
+                    column.merge(b);
                     continue;
                 }
-                // Both ends of the slot, the one that came last drawn last.
-                const bool endsHigh = b.last == b.max;
-                line.append(QPointF(b.timeMs, endsHigh ? b.min : b.max));
-                line.append(QPointF(b.timeMs + 1, endsHigh ? b.max : b.min));
+                if (column.open) column.drawInto(line);
+                column.start(number, b);
             }
-            if (!line.isEmpty()) {
+            if (column.open) {
+                column.drawInto(line);
                 panel.segments.push_back(std::move(line));
                 panel.segmentLines.push_back(lineIndex);
             }

@@ -8,9 +8,11 @@
 // A page is open all day, so a refresh that finds the same lines as before (the common case:
 // a point or two more, the oldest ones leaving the window) does not have the page rebuild
 // them: it notes which segments changed, the page hands only those their points (extend()),
-// and each change to the chart is one change (the window's two ends move together), since
-// Qt Charts lays out every line again on each. The work per refresh depends on the window,
-// never on how long the program has run.
+// and each change to the chart is one change (the window's two ends move together, the value
+// range and its rounding too), since Qt Charts lays out every line again on each. A line
+// whose points change is emptied before the axes move (clearChanged()), so that each line is
+// laid out once a refresh. The work per refresh depends on the window and, for a long one,
+// on how wide the page is (columns), never on how long the program has run.
 #pragma once
 
 #include <QList>
@@ -43,6 +45,7 @@ class ChartModel : public QObject {
     Q_PROPERTY(int panelCount READ panelCount NOTIFY changed)
     Q_PROPERTY(double fromMs READ fromMs NOTIFY windowMoved)
     Q_PROPERTY(double toMs READ toMs NOTIFY windowMoved)
+    Q_PROPERTY(int columns READ columns WRITE setColumns NOTIFY columnsChanged)
 
   public:
     ChartModel(std::shared_ptr<const History> history, Chart chart, QObject* parent = nullptr);
@@ -61,6 +64,12 @@ class ChartModel : public QObject {
     [[nodiscard]] QString missingText() const { return missingText_; }
     [[nodiscard]] int panelCount() const { return static_cast<int>(panels_.size()); }
     [[nodiscard]] double fromMs() const { return fromMs_; }
+    // How many pixels wide the lines are drawn (0, the first, for no limit). Where the window
+    // holds several slots per pixel, the slots of each run that still fits within a pixel are
+    // drawn as one, their lowest and highest value: the points handed to the chart depend on
+    // the width, not on the window (half an hour on a phone is two slots to a pixel).
+    [[nodiscard]] int columns() const { return columns_; }
+    void setColumns(int columns);
     [[nodiscard]] double toMs() const { return toMs_; }
 
     // The panel's unit ("dBm"), its lines' names, and the value range drawn.
@@ -84,9 +93,17 @@ class ChartModel : public QObject {
     // refresh before (one change, so the chart lays the line out once); a series whose points
     // are as they were is left alone.
     Q_INVOKABLE void extend(int panel, int segment, QObject* series) const;
+    // Empties a line series unless it holds the segment's points as they were (after changed(),
+    // every one): called before the axes move, so that moving them lays out only the lines that
+    // keep their points, and each of the others is laid out once, when extend() or fill() gives
+    // it its points.
+    Q_INVOKABLE void clearChanged(int panel, int segment, QObject* series) const;
     // Sets a date-time axis to the window in one change (its minimum and maximum set one after
     // the other would lay every line out twice).
     Q_INVOKABLE void showWindow(QObject* axis) const;
+    // Sets a value axis to the panel's value range rounded out to nice numbers (as
+    // applyNiceNumbers() rounds it, from the axis's tick count) in one change of range.
+    Q_INVOKABLE void showRange(int panel, QObject* axis) const;
 
     // Reads the history again if points were added to the chart since it was last read, or a
     // line would leave the window, and emits changed (and windowMoved), or extended (and
@@ -103,6 +120,7 @@ class ChartModel : public QObject {
     // The window's times changed.
     void windowMoved();
     void windowMinutesChanged();
+    void columnsChanged();
 
   private:
     // Whether a segment's points differ from the refresh before.
@@ -126,6 +144,7 @@ class ChartModel : public QObject {
     std::shared_ptr<const History> history_;
     Chart chart_;
     int windowMinutes_ = 5;
+    int columns_ = 0;
     std::vector<Panel> panels_;
     QString missingText_;
     double fromMs_ = 0;

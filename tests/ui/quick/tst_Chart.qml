@@ -197,6 +197,152 @@ TestCase {
         drawnMatchesTheModel(page, 1)
     }
 
+    // GSM neighbours heard at atMs: [arfcn, rxlev] pairs.
+    function gsmNeighbours(cells, atMs) {
+        let entries = []
+        for (const cell of cells)
+            entries.push(["arfcn", cell[0], "rxlev", cell[1]])
+        verify(testStore.record("myGSMNbrMeasDict", ["gsm_ncell_meas", entries], atMs))
+    }
+
+    // Every line the first panel draws: one line series per segment, named and coloured as its
+    // line in the legend, with the segment's points.
+    function drawnLinesMatchTheModel(page) {
+        const chart = page.chart
+        const panel = findChild(page, "panel0")
+        const view = findChild(panel, "chartView")
+        compare(view.count, chart.segmentCount(0))
+        const names = chart.seriesNames(0)
+        compare(panel.names, names)
+        for (let k = 0; k < view.count; ++k) {
+            const line = chart.segmentLine(0, k)
+            compare(view.series(k).name, names[line])
+            verify(Qt.colorEqual(view.series(k).color, page.lineColor(line)))
+            drawnMatchesTheModel(page, k)
+        }
+    }
+
+    function test_neighboursComingAndGoingLeaveNoLinesBehind() {
+        gsmNeighbours([[58, -70]], start - 2000)
+        const page = openChart("GSM", "GSM Neighbor Cell Meas")
+        const chart = page.chart
+        const view = findChild(findChild(page, "panel0"), "chartView")
+        changedSpy.target = chart
+        changedSpy.clear()
+        // Ten minutes of neighbours every two seconds: one always there, three of six others in
+        // turn, each gone long enough now and then for its line to break.
+        let most = 0
+        let kept = null
+        for (let i = 0; i < 300; ++i) {
+            let cells = [[58, -70 - (i % 5)]]
+            for (let n = 0; n < 6; ++n) {
+                if (Math.floor(i / (7 + n)) % 2 === n % 2)
+                    cells.push([60 + n, -80 - n - (i % 3)])
+            }
+            gsmNeighbours(cells, start + i * 2000)
+            chart.refresh()
+            drawnLinesMatchTheModel(page)
+            most = Math.max(most, chart.segmentCount(0))
+            if (i === 0)
+                kept = view.series(0)
+        }
+        // The first line series drew a segment all along, whichever: kept, not made anew.
+        verify(view.series(0) === kept)
+        verify(changedSpy.count > 20, changedSpy.count)
+        verify(most > 7, most)
+        // Nothing is left of the lines that went: as many series as segments, no more.
+        compare(view.count, chart.segmentCount(0))
+        // Only the always-heard neighbour after the others stop.
+        for (let i = 300; i < 460; ++i) {
+            gsmNeighbours([[58, -72]], start + i * 2000)
+            chart.refresh()
+        }
+        compare(chart.seriesNames(0), ["ARFCN 58"])
+        compare(chart.segmentCount(0), 1)
+        compare(view.count, 1)
+        drawnLinesMatchTheModel(page)
+        const legend = findChild(findChild(page, "panel0"), "legend")
+        compare(legend.children.length, 3)  // the caption, one name and the repeater
+    }
+
+    function test_thePlotAreaShowsThePageBackground() {
+        idle(-82, start)
+        idle(-80, start + 30000)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chartView = findChild(findChild(page, "panel0"), "chartView")
+        waitForRendering(view)
+        const image = grabImage(view)
+        const area = chartView.plotArea
+        verify(area.width > 100 && area.height > 100, area.width + "x" + area.height)
+        // Inside the corners of the plot area, clear of the grid and of the line.
+        const corners = [[area.x + 4, area.y + 4], [area.x + area.width - 5, area.y + 4],
+                         [area.x + 4, area.y + area.height - 5],
+                         [area.x + area.width - 5, area.y + area.height - 5]]
+        for (const corner of corners) {
+            const at = chartView.mapToItem(view, corner[0], corner[1])
+            const seen = image.pixel(Math.round(at.x), Math.round(at.y))
+            verify(Qt.colorEqual(seen, page.colors.base), seen + " at " + at)
+        }
+    }
+
+    function test_aLongWindowDrawsNoMorePointsThanThePageHasPixels() {
+        // Half an hour of a low and a high value in every two-second slot.
+        for (let i = 0; i < 900; ++i) {
+            idle(-80 - (i % 4), start + i * 2000)
+            idle(-70 + (i % 3), start + i * 2000 + 1000)
+        }
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chart = page.chart
+        compare(chart.columns, Math.floor(page.width))
+        // Five minutes: every slot, its low and its high value.
+        compare(chart.segmentCount(0), 1)
+        compare(chart.points(0, 0).length, 2 * 150)
+        drawnMatchesTheModel(page, 0)
+        // Half an hour on 390 pixels: two slots to a column, as low and as high as both.
+        mouseClick(findChild(page, "window30"))
+        compare(chart.segmentCount(0), 1)
+        const points = chart.points(0, 0)
+        compare(points.length, 2 * 450)
+        let lowest = 0
+        let highest = -200
+        for (const point of points) {
+            lowest = Math.min(lowest, point.y)
+            highest = Math.max(highest, point.y)
+        }
+        compare(lowest, -83)
+        compare(highest, -68)
+        compare(chart.minimum(0) <= -83 && chart.maximum(0) >= -68, true)
+        drawnMatchesTheModel(page, 0)
+        // Each column spans its slots: from the first slot's time, low then high.
+        compare(points[0].x, start)
+        compare(points[1].x, start + 1)
+        compare(points[0].y, -81)
+        compare(points[1].y, -69)
+    }
+
+    function test_theValueAxisCoversTheLinesInRoundNumbers() {
+        idle(-82, start)
+        const page = openChart("GSM", "Idle Serv Cell Meas")
+        const chart = page.chart
+        const axis = findChild(page, "panel0").valueAxis
+        const covers = () => {
+            verify(axis.min <= chart.minimum(0) && axis.max >= chart.maximum(0),
+                   axis.min + ".." + axis.max + " for " + chart.minimum(0) + ".." + chart.maximum(0))
+            const step = (axis.max - axis.min) / (axis.tickCount - 1)
+            compare(Math.round(axis.min / step) * step, axis.min)
+            compare(Math.round(axis.max / step) * step, axis.max)
+        }
+        covers()
+        idle(-40, start + 2000)
+        chart.refresh()
+        covers()
+        verify(axis.max >= -40)
+        idle(-110, start + 4000)
+        chart.refresh()
+        covers()
+        verify(axis.min <= -110)
+    }
+
     function lteTxPower(dBm, atMs) {
         verify(testStore.record("myLTETxPowerDict",
                                 ["tx_power_info", [["pusch_tx_power", dBm]]], atMs))
