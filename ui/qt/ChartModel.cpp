@@ -165,26 +165,24 @@ void ChartModel::fill(int panel, int index, QObject* series) const {
     if (auto* const line = qobject_cast<QXYSeries*>(series)) line->replace(points(panel, index));
 }
 
-void ChartModel::extend(int panel, int index, QObject* series) const {
-    auto* const line = qobject_cast<QXYSeries*>(series);
+const QList<QPointF>* ChartModel::staleSegment(int panel, int index, const QXYSeries* line) const {
     const Panel* p = panelAt(panel);
     if (line == nullptr || p == nullptr || index < 0 ||
         index >= static_cast<int>(p->segments.size()))
-        return;
+        return nullptr;
     const auto at = static_cast<std::size_t>(index);
-    if (p->changes[at] != Change::Same || line->count() != p->segments[at].size())
-        line->replace(p->segments[at]);
+    if (p->changes[at] == Change::Same && line->count() == p->segments[at].size()) return nullptr;
+    return &p->segments[at];
+}
+
+void ChartModel::extend(int panel, int index, QObject* series) const {
+    auto* const line = qobject_cast<QXYSeries*>(series);
+    if (const QList<QPointF>* points = staleSegment(panel, index, line)) line->replace(*points);
 }
 
 void ChartModel::clearChanged(int panel, int index, QObject* series) const {
     auto* const line = qobject_cast<QXYSeries*>(series);
-    const Panel* p = panelAt(panel);
-    if (line == nullptr || p == nullptr || index < 0 ||
-        index >= static_cast<int>(p->segments.size()))
-        return;
-    const auto at = static_cast<std::size_t>(index);
-    if (line->count() > 0 &&
-        (p->changes[at] != Change::Same || line->count() != p->segments[at].size()))
+    if (line != nullptr && line->count() > 0 && staleSegment(panel, index, line) != nullptr)
         line->replace(QList<QPointF>());
 }
 

@@ -30,6 +30,7 @@
 #include "metrics/history/Quantity.h"
 
 class QAbstractSeries;
+class QXYSeries;
 
 namespace pyx::qt {
 
@@ -136,6 +137,11 @@ class ChartModel : public QObject {
         double maximum = 0;
     };
     [[nodiscard]] const Panel* panelAt(int panel) const;
+    // The points a line series is to draw for segment `index` of a panel when they are not the
+    // ones it holds (changed since the refresh before, or not as many); nullptr when they are,
+    // or for no such series or segment.
+    [[nodiscard]] const QList<QPointF>* staleSegment(int panel, int index,
+                                                     const QXYSeries* line) const;
     void rebuild();
     // Whether the panels now draw the same lines and segments as before, and if so each
     // segment's change since.
