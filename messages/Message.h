@@ -154,12 +154,12 @@ const std::shared_ptr<T>& requireElement(const std::shared_ptr<T>& element) {
     PYX_OBJECT_ACCESSORS(std::shared_ptr<Class>, name, Name)
 
 #define PYX_ACCESSORS_MSGS(tag, key, names, Names, name, Name, Class)                    \
-    [[nodiscard]] const std::vector<std::shared_ptr<Class>>& names() const {             \
+    [[nodiscard]] const ::pyx::MessageList<Class>& names() const {                       \
         return names##_;                                                                 \
     }                                                                                    \
-    void set##Names(std::vector<std::shared_ptr<Class>> values) {                        \
+    void set##Names(const std::vector<std::shared_ptr<Class>>& values) {                 \
         for (const auto& v : values) ::pyx::detail::requireElement(v);                   \
-        names##_ = std::move(values);                                                    \
+        names##_.assign(values.begin(), values.end());                                   \
         has_ |= ::pyx::detail::bitOf(kBit_##names);                                      \
     }                                                                                    \
     void clear##Names() {                                                                \
@@ -224,7 +224,7 @@ const std::shared_ptr<T>& requireElement(const std::shared_ptr<T>& element) {
 #define PYX_STORAGE_STRING(tag, key, name, Name) std::optional<std::string> name##_;
 #define PYX_STORAGE_MSG(tag, key, name, Name, Class) std::shared_ptr<Class> name##_;
 #define PYX_STORAGE_MSGS(tag, key, names, Names, name, Name, Class) \
-    std::vector<std::shared_ptr<Class>> names##_;
+    ::pyx::MessageList<Class> names##_;
 #define PYX_STORAGE_U32S(tag, key, names, Names, name, Name) ::pyx::PBRepeatedUInt32 names##_;
 #define PYX_STORAGE_S32S(tag, key, names, Names, name, Name) ::pyx::PBRepeatedInt32 names##_;
 

@@ -26,12 +26,17 @@ enum class FieldKind : std::uint8_t {
     Data,         // optional bytes: std::optional<Bytes>
     String,       // optional string: std::optional<std::string>
     Message,      // optional nested message: std::shared_ptr<T>
-    MessageList,  // repeated nested message: std::vector<std::shared_ptr<T>>
+    MessageList,  // repeated nested message: MessageList<T>
     UInt32List,   // repeated uint32, written packed: std::vector<std::uint32_t>
     SInt32List,   // repeated sint32, written packed: std::vector<std::int32_t>
 };
 
 struct MessageDescriptor;
+
+// What a repeated nested message is kept in: its elements' pointers live in the block pool, as
+// the elements do (a list is made for every record with one, and dropped with it).
+template <class T>
+using MessageList = std::vector<std::shared_ptr<T>, PoolAllocator<std::shared_ptr<T>>>;
 
 // What the runtime needs to do with the storage of a nested message of class T without
 // knowing T: one instance per nested class (see kSubMessageOps below).
@@ -41,7 +46,7 @@ struct SubMessageOps {
     const void* (*get)(const void* slot);
     void* (*makeNew)(void* slot);
     void (*share)(void* dstSlot, const void* srcSlot);
-    // A list slot (std::vector<std::shared_ptr<T>>).
+    // A list slot (MessageList<T>).
     std::size_t (*count)(const void* list);
     const void* (*at)(const void* list, std::size_t index);
     void* (*appendNew)(void* list);
@@ -138,7 +143,7 @@ constexpr bool ascendingTags(const FieldDescriptor (&fields)[N]) {
 template <class T>
 using Slot = std::shared_ptr<T>;
 template <class T>
-using ListSlot = std::vector<std::shared_ptr<T>>;
+using ListSlot = MessageList<T>;
 
 template <class T>
 inline constexpr SubMessageOps kSubMessageOps = {
