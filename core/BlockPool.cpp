@@ -56,20 +56,15 @@ void* allocateSlow(std::size_t bytes) {
     return ::operator new(blockSizeOf(c));
 }
 
+// The inline release keeps every block it can once the thread's clean-up is registered; the
+// one it leaves here that a list could still take is the first of a thread.
 void releaseSlow(void* block, std::size_t bytes) noexcept {
-    const std::size_t c = classOf(bytes);
-    FreeLists& lists = tLists;
-    if (c < kClasses && !lists.started) registerCleanUp();
-    if (c >= kClasses || lists.finished || lists.count[c] >= kKeptBytesPerClass / blockSizeOf(c) ||
-        lists.keptBytes >= kKeptBytesPerThread) {
-        ::operator delete(block);
+    if (classOf(bytes) < kClasses && !tLists.started) {
+        registerCleanUp();
+        poolRelease(block, bytes);
         return;
     }
-    auto* const freed = static_cast<FreeBlock*>(block);
-    freed->next = lists.head[c];
-    lists.head[c] = freed;
-    ++lists.count[c];
-    lists.keptBytes += blockSizeOf(c);
+    ::operator delete(block);
 }
 
 #endif
